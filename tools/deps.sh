@@ -1,0 +1,22 @@
+# Installs the Debian packages the project needs, only when one is missing.
+zx917_packages=(cmake g++ ninja-build pkg-config qt6-base-dev qt6-serialport-dev
+    libgtest-dev libgmock-dev socat)
+
+ensure_deps() {
+    local missing=()
+    for p in "${zx917_packages[@]}"; do
+        dpkg-query -W -f='${Status}' "$p" 2>/dev/null | grep -q "ok installed" || missing+=("$p")
+    done
+    [ ${#missing[@]} -eq 0 ] && return 0
+    echo "Installing: ${missing[*]}" >&2
+    local sudo=""
+    [ "$(id -u)" -ne 0 ] && sudo="sudo"
+    $sudo apt-get update
+    DEBIAN_FRONTEND=noninteractive $sudo apt-get install -y "${missing[@]}"
+}
+
+build_project() {
+    local dir="$1"; shift
+    cmake -S "$zx917_root" -B "$dir" -G Ninja -DCMAKE_BUILD_TYPE=RelWithDebInfo "$@" >/dev/null
+    cmake --build "$dir" -j"$(nproc)"
+}

@@ -1,0 +1,47 @@
+// zx917-download: the download program's operations from the command line.
+#include <iostream>
+#include <string>
+#include <vector>
+
+#include "download/commands.h"
+
+namespace {
+
+constexpr const char* kUsage = R"(usage: zx917-download COMMAND [OPTIONS]
+
+Commands:
+  check FILE...         check download files as the file chooser does, then read every
+                        record of every section and verify its checksum; prints the revision,
+                        the length and the records and bytes each section sends.
+                        Exit status 0 when every file passed, 1 otherwise.
+  identify --port DEV [--settings 9600,n,8,1] [--terminator crlf|cr|lf] [--xon]
+                        [--trace FILE]
+                        identify the instrument and read its current firmware revision.
+  download --port DEV --file FILE [same options] [--yes]
+                        identify, check the file and send it to the instrument.
+                        Exit status 0 only when the instrument confirmed the new revision.
+  --help                show this text.
+)";
+
+}  // namespace
+
+int main(int argc, char** argv) {
+    std::vector<std::string> args(argv + 1, argv + argc);
+    if (args.empty() || args[0] == "--help" || args[0] == "-h" || args[0] == "help") {
+        std::cout << kUsage;
+        return args.empty() ? 2 : 0;
+    }
+    const std::string command = args[0];
+    args.erase(args.begin());
+    for (const auto& a : args) {
+        if (a == "--help" || a == "-h") {
+            std::cout << kUsage;
+            return 0;
+        }
+    }
+    if (command == "check") return zx917::RunCheckCommand(args);
+    if (command == "identify") return zx917::RunIdentifyCommand(args);
+    if (command == "download") return zx917::RunDownloadCommand(args);
+    std::cerr << "zx917-download: unknown command '" << command << "'\n" << kUsage;
+    return 2;
+}
