@@ -39,6 +39,7 @@ public:
         return true;
     }
     std::size_t pending() const { return items_.size(); }
+    int64_t nextAt() const { return items_.empty() ? INT64_MAX : items_.begin()->first.first; }
 
 private:
     int64_t now_ = 0;
