@@ -86,7 +86,18 @@ void Instrument::receive(std::span<const uint8_t> bytes, bool lineOk, const std:
         return;
     }
     for (const uint8_t b : bytes) {
-        if (!area_.empty() && !awaitingEcho_) {
+        if (awaitingEcho_) {
+            // The echo is terminator, request, terminator; records follow right after it.
+            echo_.push_back(static_cast<char>(b));
+            const std::string want = "RESTART:" + area_ + opt_.terminator;
+            if (echo_.ends_with(want)) {
+                awaitingEcho_ = false;
+                echo_.clear();
+                areaRecord_ = 0;
+                areas_[area_].clear();
+                log_.push_back({"RESTART:" + area_, lastSettings_, now});
+            }
+        } else if (!area_.empty()) {
             handleRecordBytes(b, now);
         } else if (b == '\r' || b == '\n') {
             if (!text_.empty()) handleLine(text_, now);
@@ -150,15 +161,6 @@ std::string Instrument::revAnswer(const std::string& revision) const {
 }
 
 void Instrument::handleLine(const std::string& line, int64_t now) {
-    if (awaitingEcho_) {
-        if (line == "RESTART:" + area_) {
-            awaitingEcho_ = false;
-            areaRecord_ = 0;
-            areas_[area_].clear();
-            log_.push_back({line, lastSettings_, now});
-        }
-        return;
-    }
     const std::string cmd = line.substr(0, line.find(' '));
     const std::string arg = line.size() > cmd.size() + 1 ? line.substr(cmd.size() + 1) : "";
     log_.push_back({line, lastSettings_, now});

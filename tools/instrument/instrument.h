@@ -38,6 +38,7 @@ struct InstrumentOptions {
     std::string revision = "A.01.02";
     char ampsFlag = '1';
     LineSettings userLine;  // 9600,n,8,1
+    std::string terminator = "\r\n";  // the line end the engineer set up on both sides
     int answerDelayMs = 2;
     int openDelayMs = 20;
     int programDelayMs = 100;  // after the last record of an area
@@ -110,6 +111,7 @@ private:
     int areaRecord_ = 0;
     std::vector<uint8_t> rec_;  // record being received, length bytes first
     std::string text_;          // text line being received
+    std::string echo_;          // bytes received while the restart echo is awaited
     std::map<std::string, int> occurrences_;
     std::map<std::string, std::vector<std::vector<uint8_t>>> areas_;
     std::vector<CommandLog> log_;

@@ -1,0 +1,43 @@
+// A simulated world with the firmware operations on top: dialogs, view and a download file.
+#pragma once
+
+#include "app/texts.h"
+#include "common/download_files.h"
+#include "firmware/operations.h"
+#include "support/fake_dialogs.h"
+#include "support/fake_view.h"
+#include "support/sim_world.h"
+
+namespace zx917::test {
+
+struct FirmwareRig {
+    explicit FirmwareRig(InstrumentOptions options = {}, bool withInstrument = true)
+        : world(std::move(options), withInstrument),
+          ops(FirmwareParts{world.app, texts, dialogs, world.file, world.engine, world.port,
+                            world.timer1, view}) {
+        InitMessages(texts);
+    }
+
+    // Chooses the file as "&Open" does after its check.
+    void choose(const gen::Bytes& content, const std::string& revision = "A.02.00") {
+        world.app.FilePath = dir.write("NEW.HEX", content);
+        world.app.SelectedFileName = "NEW.HEX";
+        world.app.SelectedRevision = revision;
+    }
+
+    // The wizard's road from page 1 to the end of the download.
+    bool download() {
+        if (!ops.ReadCurrentRevision()) return false;
+        if (!ops.PrepareDownload()) return false;
+        return ops.StartDownload();
+    }
+
+    TextTables texts;
+    FakeDialogs dialogs;
+    FakeView view;
+    SimWorld world;
+    FirmwareOperations ops;
+    gen::TempDir dir;
+};
+
+}  // namespace zx917::test
