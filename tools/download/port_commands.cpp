@@ -1,18 +1,197 @@
-// identify and download need the Qt serial adapter; this build has none.
+// identify and download: the program's own operations on Qt's core event loop and the Qt
+// serial adapter, with the messages and questions on the terminal.
+#include <QCoreApplication>
+#include <cstdlib>
+#include <filesystem>
 #include <iostream>
+#include <memory>
 
+#include "app/app_state.h"
+#include "app/file_slot.h"
+#include "app/texts.h"
+#include "download/cli_view.h"
 #include "download/commands.h"
+#include "download/trace_writer.h"
+#include "firmware/download_file.h"
+#include "firmware/operations.h"
+#include "firmware/revision.h"
+#include "link/command_script.h"
+#include "link/engine.h"
+#include "link/line_settings.h"
+#include "link/qt/qt_platform.h"
+#include "link/qt/qt_serial_port.h"
+#include "terminal_dialogs.h"
 
 namespace zx917 {
 
-int RunIdentifyCommand(const std::vector<std::string>&) {
-    std::cerr << "zx917-download: identify is not available in this build\n";
+namespace {
+
+struct Options {
+    std::string port, settings = kDefaultSettings, terminator = kDefaultTerminator, trace, file;
+    bool xon = false;
+    bool yes = false;
+};
+
+bool parse(const std::vector<std::string>& args, bool download, Options& o) {
+    for (std::size_t i = 0; i < args.size(); ++i) {
+        const std::string& a = args[i];
+        const bool hasValue = i + 1 < args.size();
+        if (a == "--port" && hasValue) o.port = args[++i];
+        else if (a == "--settings" && hasValue) o.settings = args[++i];
+        else if (a == "--trace" && hasValue) o.trace = args[++i];
+        else if (a == "--file" && hasValue && download) o.file = args[++i];
+        else if (a == "--terminator" && hasValue) {
+            const std::string t = args[++i];
+            if (t != "crlf" && t != "cr" && t != "lf") return false;
+            o.terminator = t == "cr" ? "\r" : t == "lf" ? "\n" : "\r\n";
+        } else if (a == "--xon") o.xon = true;
+        else if (a == "--yes" && download) o.yes = true;
+        else return false;
+    }
+    return !o.port.empty() && (!download || !o.file.empty()) && ParseLineSettings(o.settings);
+}
+
+// One program world on Qt's event loop.
+class Session {
+public:
+    explicit Session(const Options& o)
+        : opt_(o),
+          engine(EngineParts{app, script, port, retry, rsRetry, timer1, pump, file}),
+          dialogs(o.yes),
+          ops(FirmwareParts{app, texts, dialogs, file, engine, port, timer1, view}) {
+        InitMessages(texts);
+        InitCommandScript(script);
+        InitDefaults(app, std::filesystem::current_path().string());
+        if (!o.trace.empty()) {
+            trace = std::make_unique<TraceWriter>(o.trace);
+            port.onTraffic = [this](bool sent, std::span<const uint8_t> bytes) {
+                trace->traffic(sent, bytes, port.settings() + (port.handshaking() ? " hs" + std::to_string(port.handshaking()) : ""));
+            };
+            engine.setTrace([this](const std::string& e) { trace->event(e); });
+        }
+    }
+    ~Session() {
+        if (trace) trace->flush();
+    }
+
+    // Opens the port as the settings page applies the engineer's choice.
+    bool openPort() {
+        ::setenv("ZX917_COM1", opt_.port.c_str(), 1);
+        port.setCommPort(1);
+        if (!port.setPortOpen(true)) {
+            dialogs.critical(texts.MessageTable[kMsgPortMissing]);
+            std::cerr << "(" << port.errorText() << ")" << std::endl;
+            return false;
+        }
+        port.setSettings(opt_.settings);
+        app.Terminator = opt_.terminator;
+        port.setHandshaking(opt_.xon ? 1 : 0);
+        if (trace) trace->event("port " + opt_.port + " open at " + port.settings());
+        return true;
+    }
+
+    void putPortBack() {
+        port.setSettings(opt_.settings);
+        port.setHandshaking(opt_.xon ? 1 : 0);
+        port.setPortOpen(false);
+    }
+
+    const Options opt_;
+    AppState app;
+    TextTables texts;
+    CommandScript script;
+    FileSlot file;
+    QtSerialPort port;
+    QtTimer retry{kRetryIntervalMs};
+    QtTimer rsRetry{kRsRetryIntervalMs};
+    QtTimer timer1{kTimer1IntervalMs};
+    QtEventPump pump;
+    Engine engine;
+    TerminalDialogs dialogs;
+    CliView view;
+    FirmwareOperations ops;
+    std::unique_ptr<TraceWriter> trace;
+};
+
+int usage(const char* command) {
+    std::cerr << "zx917-download " << command << ": bad options (see --help)\n";
     return 2;
 }
 
-int RunDownloadCommand(const std::vector<std::string>&) {
-    std::cerr << "zx917-download: download is not available in this build\n";
-    return 2;
+QCoreApplication& qtCore() {
+    static int argc = 1;
+    static char name[] = "zx917-download";
+    static char* argv[] = {name, nullptr};
+    static QCoreApplication app(argc, argv);
+    return app;
+}
+
+void printRevision(const Session& s) {
+    std::cout << "current revision: " << Latin1ToUtf8(StripFillers(s.app.CurrentRevision.str()))
+              << "\n";
+    if (s.app.AmpsSectionFlag.empty()) {
+        std::cout << "AMPS flag: not read (identified without the download mode)\n";
+    } else {
+        std::cout << "AMPS flag: " << Latin1ToUtf8(s.app.AmpsSectionFlag) << "\n";
+    }
+}
+
+}  // namespace
+
+int RunIdentifyCommand(const std::vector<std::string>& args) {
+    Options o;
+    if (!parse(args, false, o)) return usage("identify");
+    qtCore();
+    Session s(o);
+    if (!s.openPort()) return 1;
+    const bool ok = s.ops.ReadCurrentRevision();
+    if (ok) printRevision(s);
+    s.putPortBack();
+    return ok ? 0 : 1;
+}
+
+int RunDownloadCommand(const std::vector<std::string>& args) {
+    Options o;
+    if (!parse(args, true, o)) return usage("download");
+    qtCore();
+    Session s(o);
+    AppState& app = s.app;
+    if (!s.openPort()) return 1;
+    if (!s.ops.ReadCurrentRevision()) {
+        s.putPortBack();
+        return 1;
+    }
+    printRevision(s);
+    // The file chooser's check, with the hardware question, and what "&Open" keeps.
+    const std::filesystem::path path = std::filesystem::absolute(o.file);
+    if (!CheckDownloadFile({app, s.file, s.dialogs, s.texts}, path.string(), 1)) {
+        s.putPortBack();
+        return 1;
+    }
+    app.FilePath = path.string();
+    app.SelectedFileName = path.filename().string();
+    app.HexFolder = path.parent_path().string();
+    app.SelectedRevision = app.NewRevision;
+    std::cout << "new revision: " << Latin1ToUtf8(StripFillers(app.SelectedRevision.str()))
+              << " (" << app.SelectedFileName << ")\n";
+    if (CurrentIsNewerOrEqual(app.CurrentRevision, app.SelectedRevision) &&
+        !s.dialogs.question(s.texts.MessageTable[kMsgCurrentIsNewer])) {
+        s.putPortBack();
+        return 1;
+    }
+    if (!s.ops.PrepareDownload()) {
+        s.putPortBack();
+        return 1;
+    }
+    std::cout << "download time: " << s.view.estimate << std::endl;
+    if (!s.dialogs.question(s.texts.QuestionTable[kQstStart])) {
+        s.putPortBack();
+        return 1;
+    }
+    const bool ok = s.ops.StartDownload();
+    if (ok) std::cout << "Download successfully completed." << std::endl;
+    s.port.setPortOpen(false);
+    return ok ? 0 : 1;
 }
 
 }  // namespace zx917

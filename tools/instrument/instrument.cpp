@@ -80,6 +80,10 @@ std::vector<Emission> Instrument::takeEmissions() {
 void Instrument::receive(std::span<const uint8_t> bytes, bool lineOk, const std::string& settings,
                          int64_t now) {
     if (dead_) return;
+    if (restartAt_ >= 0 && now >= restartAt_) {
+        line_ = opt_.userLine;  // restarted: back on its own settings
+        restartAt_ = -1;
+    }
     lastSettings_ = settings;
     if (!lineOk) {
         text_.clear();  // garbled on the line
@@ -207,6 +211,9 @@ void Instrument::handleLine(const std::string& line, int64_t now) {
     } else if (cmd == "REVC") {
         revcOk_ = !announced_.empty() && arg == announced_;
         reply(revAnswer(opt_.wrongRevc ? "Z.99.99" : announced_));
+        if (opt_.readyAfterRevcMs >= 0) {
+            out_.push_back({Emission::Data, busyUntil_ + opt_.readyAfterRevcMs, {'\r', '\n'}});
+        }
     } else if (cmd == "REBOOT") {
         reply("REBOOT");
         confirmed_ = revcOk_ && !opt_.wrongRevc;
@@ -214,8 +221,8 @@ void Instrument::handleLine(const std::string& line, int64_t now) {
         rebooted_ = true;
         downloadMode_ = false;
         opened_ = false;
-        line_ = opt_.userLine;
-        out_.push_back({Emission::DsrRise, busyUntil_ + 50, {}});
+        restartAt_ = busyUntil_ + 50;  // the answer still goes out at the download speed
+        out_.push_back({Emission::DsrRise, restartAt_, {}});
     }
 }
 

@@ -46,6 +46,7 @@ struct InstrumentOptions {
     bool noDownloadMode = false; // ignores "MAINTENANCE:DOWNLOAD"
     bool wrongRevc = false;      // "REVC" answers with another revision
     bool noise = false;          // noise lines and control characters before every answer
+    int readyAfterRevcMs = -1;   // an empty line this long after the REVC answer; -1: none
     std::vector<Fault> faults;
 };
 
@@ -81,6 +82,7 @@ public:
         return areas_;
     }
     const std::string& revision() const { return revision_; }
+    char ampsFlag() const { return opt_.ampsFlag; }
     bool rebooted() const { return rebooted_; }
     // "REVC" confirmed the announced revision and "REBOOT" was answered.
     bool confirmed() const { return confirmed_; }
@@ -118,6 +120,7 @@ private:
     std::vector<Emission> out_;
     std::string lastSettings_;
     int64_t busyUntil_ = 0;  // answers keep their order
+    int64_t restartAt_ = -1; // when the instrument has restarted after REBOOT
     int restartsSent_ = 0;
     bool dead_ = false;
 };
