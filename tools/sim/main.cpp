@@ -157,7 +157,14 @@ int main(int argc, char** argv) {
     zx917::Instrument inst(opt);
     const auto start = Clock::now();
     std::deque<Pending> out;
-    std::deque<std::pair<Clock::time_point, std::vector<uint8_t>>> in;  // arriving on the line
+    // Bytes on their way in: due time, bytes, the settings they were written at.
+    struct Incoming {
+        Clock::time_point due;
+        std::vector<uint8_t> bytes;
+        std::string settings;
+        bool ok;
+    };
+    std::deque<Incoming> in;
     Clock::time_point rxFree = start, txFree = start;
     std::string prevSettings;
     bool hungUp = false;
@@ -182,7 +189,7 @@ int main(int argc, char** argv) {
     while (!gStop && Clock::now() < endAt) {
         auto next = Clock::now() + std::chrono::milliseconds(200);
         if (!out.empty()) next = std::min(next, out.front().due);
-        if (!in.empty()) next = std::min(next, in.front().first);
+        if (!in.empty()) next = std::min(next, in.front().due);
         const auto waitMs = std::max<int64_t>(
             0, std::chrono::duration_cast<std::chrono::milliseconds>(next - Clock::now()).count());
         pollfd p{master, POLLIN, 0};
@@ -197,15 +204,17 @@ int main(int argc, char** argv) {
                     due = std::max(due, rxFree) + charTime() * n;
                     rxFree = due;
                 }
-                in.emplace_back(due, std::vector<uint8_t>(buf, buf + n));
+                // Judged at the settings they were written at; bytes written just before a
+                // speed change still count as sent at the old settings.
+                const std::string now = current();
+                const bool ok = matches(now) || (now != prevSettings && matches(prevSettings));
+                in.push_back({due, std::vector<uint8_t>(buf, buf + n), now, ok});
             }
         }
         // Bytes that have fully arrived go to the instrument at the settings of the moment;
         // bytes written just before a speed change still count as sent at the old settings.
-        while (!in.empty() && in.front().first <= Clock::now()) {
-            const std::string now = current();
-            const bool ok = matches(now) || (now != prevSettings && matches(prevSettings));
-            inst.receive(in.front().second, ok, now, msSince(start));
+        while (!in.empty() && in.front().due <= Clock::now()) {
+            inst.receive(in.front().bytes, in.front().ok, in.front().settings, msSince(start));
             in.pop_front();
             for (auto& e : inst.takeEmissions()) {
                 out.push_back({start + std::chrono::milliseconds(e.atMs), std::move(e)});
