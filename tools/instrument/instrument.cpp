@@ -89,6 +89,7 @@ void Instrument::receive(std::span<const uint8_t> bytes, bool lineOk, const std:
         text_.clear();  // garbled on the line
         return;
     }
+    if (inWindow_) window_.bytesIn += static_cast<int64_t>(bytes.size());
     for (const uint8_t b : bytes) {
         if (awaitingEcho_) {
             // The echo is terminator, request, terminator; records follow right after it.
@@ -114,11 +115,16 @@ void Instrument::receive(std::span<const uint8_t> bytes, bool lineOk, const std:
 }
 
 void Instrument::answer(const std::string& text, int64_t now, int delayMs) {
-    const int64_t at = std::max(now + (delayMs < 0 ? opt_.answerDelayMs : delayMs), busyUntil_);
+    const int delay = delayMs < 0 ? opt_.answerDelayMs : delayMs;
+    const int64_t at = std::max(now + delay, busyUntil_);
     busyUntil_ = at;
     std::string s;
     if (opt_.noise) s += "\x01# status 0\t\x02\r\n\x07";
     s += text + "\r\n";
+    if (inWindow_) {
+        window_.bytesOut += static_cast<int64_t>(s.size());
+        window_.delaysMs += delay;
+    }
     out_.push_back({Emission::Data, at, std::vector<uint8_t>(s.begin(), s.end())});
 }
 
@@ -195,7 +201,13 @@ void Instrument::handleLine(const std::string& line, int64_t now) {
     if (cmd == "MAINTENANCE:DOWNLOAD") {
         reply("DOWNLOAD READY");
     } else if (cmd == "REVD") {
-        if (arg != "X.XX.XX") announced_ = arg;
+        if (arg != "X.XX.XX") {
+            announced_ = arg;
+            inWindow_ = true;
+            window_ = Window{};
+            window_.startMs = now;
+            window_.bytesIn = static_cast<int64_t>(line.size()) + 2;
+        }
         reply(revAnswer(revision_));
     } else if (cmd == "OPEN") {
         opened_ = true;
@@ -207,6 +219,8 @@ void Instrument::handleLine(const std::string& line, int64_t now) {
         areas_[area_].clear();
         reply(cmd);
     } else if (cmd == "CLOSE") {
+        if (inWindow_) window_.endMs = now;
+        inWindow_ = false;
         reply("CLOSE");
     } else if (cmd == "REVC") {
         revcOk_ = !announced_.empty() && arg == announced_;
@@ -285,7 +299,10 @@ std::string Instrument::reportJson() const {
         first = false;
     }
     o << "},\n  \"restarts\": " << restartsSent_ << ",\n  \"revision\": " << jsonString(revision_)
-      << ",\n  \"confirmed\": " << (confirmed_ ? "true" : "false") << "\n}\n";
+      << ",\n  \"confirmed\": " << (confirmed_ ? "true" : "false")
+      << ",\n  \"transfer\": {\"ms\": " << (window_.endMs - window_.startMs)
+      << ", \"bytes_in\": " << window_.bytesIn << ", \"bytes_out\": " << window_.bytesOut
+      << ", \"delays_ms\": " << window_.delaysMs << "}\n}\n";
     return o.str();
 }
 

@@ -89,6 +89,13 @@ public:
     int restartsSent() const { return restartsSent_; }
     std::string reportJson() const;
 
+    // The transfer window, from "REVD" with the new revision to "CLOSE": its length, the bytes
+    // each way and the delays the instrument itself took (answers, OPEN, programming).
+    struct Window {
+        int64_t startMs = -1, endMs = -1, bytesIn = 0, bytesOut = 0, delaysMs = 0;
+    };
+    const Window& window() const { return window_; }
+
 private:
     void handleLine(const std::string& line, int64_t now);
     void handleRecordBytes(uint8_t b, int64_t now);
@@ -123,6 +130,8 @@ private:
     int64_t restartAt_ = -1; // when the instrument has restarted after REBOOT
     int restartsSent_ = 0;
     bool dead_ = false;
+    Window window_;
+    bool inWindow_ = false;
 };
 
 }  // namespace zx917

@@ -31,6 +31,7 @@ The ZX917 instrument on a pseudo-terminal.
   --amps-flag C          flag in its REV answers; 0 leaves the AMPS section out (1)
   --program-delay MS     time to program an area after its last record (100)
   --open-delay MS        time to answer OPEN (20)
+  --answer-delay MS      time to answer any other command or record (2)
   --idn-only             answer "*IDN?" and nothing else
   --no-download-mode     ignore "MAINTENANCE:DOWNLOAD"
   --wrong-revc           confirm another revision on "REVC"
@@ -110,6 +111,7 @@ int main(int argc, char** argv) {
         } else if (a == "--amps-flag") opt.ampsFlag = next()[0];
         else if (a == "--program-delay") opt.programDelayMs = std::atoi(next().c_str());
         else if (a == "--open-delay") opt.openDelayMs = std::atoi(next().c_str());
+        else if (a == "--answer-delay") opt.answerDelayMs = std::atoi(next().c_str());
         else if (a == "--idn-only") opt.idnOnly = true;
         else if (a == "--no-download-mode") opt.noDownloadMode = true;
         else if (a == "--wrong-revc") opt.wrongRevc = true;
