@@ -37,7 +37,9 @@ TEST(CheckTool_Verdicts, CountsRecordsAndFindsBadOnes) {
     oneRecord.sections[0].records = {gen::IntelEnd()};
 
     const Case cases[] = {
-        {"intel", intel, 0,
+        {"intel",
+         intel,
+         0,
          {"revision: A.01.02", "MDSP: 4 records, 80 bytes", "MPU: 4 records, 80 bytes"}},
         {"srec", srec, 0, {"CDMA: 6 records, 149 bytes"}},
         {"one-record section", oneRecord, 0, {"MDSP: 1 records, 8 bytes"}},

@@ -1,13 +1,14 @@
 // The download-file check: verdicts, messages, revision and the hardware question.
+#include "firmware/download_file.h"
+
 #include <gtest/gtest.h>
 
 #include <filesystem>
 
 #include "app/app_state.h"
 #include "app/texts.h"
-#include "firmware/download_file.h"
-#include "firmware/record.h"
 #include "common/download_files.h"
+#include "firmware/record.h"
 #include "support/fake_dialogs.h"
 
 namespace zx917 {
@@ -17,7 +18,7 @@ using gen::Bytes;
 using test::FakeDialogs;
 
 const std::string kHeader = "A.01.02\r\nMDSP:\r\nCDMA:\r\nAMPS:\r\nMPU:\r\n";  // 36 bytes
-const std::string kEnd = "[EOF]\r\n";                                        // 7 bytes
+const std::string kEnd = "[EOF]\r\n";                                          // 7 bytes
 
 std::string padded(const std::string& header, std::size_t total, const std::string& end = kEnd) {
     return header + std::string(total - header.size() - end.size(), 'x') + end;
@@ -66,10 +67,10 @@ TEST_F(CheckFile, Verdicts_ByContent) {
          "A.01.02"},
         {"quoted revision", padded("\"B.02.10\"\r\nMDSP:\r\nCDMA:\r\nAMPS:\r\nMPU:\r\n", 80), true,
          -1, "B.02.10"},
-        {"3-character revision", padded("A.1\r\nMDSP:\r\nCDMA:\r\nAMPS:\r\nMPU:\r\n", 80), true,
-         -1, "A.1    "},
-        {"10-character revision",
-         padded("A.01.02XYZ\r\nMDSP:\r\nCDMA:\r\nAMPS:\r\nMPU:\r\n", 80), true, -1, "A.01.02"},
+        {"3-character revision", padded("A.1\r\nMDSP:\r\nCDMA:\r\nAMPS:\r\nMPU:\r\n", 80), true, -1,
+         "A.1    "},
+        {"10-character revision", padded("A.01.02XYZ\r\nMDSP:\r\nCDMA:\r\nAMPS:\r\nMPU:\r\n", 80),
+         true, -1, "A.01.02"},
         {"ends inside the header", "A.01.02\r\nMDSP:" + std::string(70, 'x'), false,
          kMsgCouldNotRead, nullptr},
         {"full file with sections", full + std::string(40, 'y') + kEnd, true, -1, "A.01.02"},

@@ -39,11 +39,20 @@ TEST(Engine_Framing, EveryCommandGoesOutAsItShould) {
         EXPECT_EQ(w.app.RecordBytes, (std::vector<uint8_t>{0, 0}));
         w.engine.RunStage(8, 0);
         EXPECT_TRUE(w.app.StepResult);
-        const std::vector<std::string> want = {
-            "*CLS\n", "DISPlay:CONFigure\n", "SYSTem:ERRor?" + term, "*IDN?" + term,
-            "MAINTENANCE:DOWNLOAD\n", "REVD X.XX.XX\n\n", "REVD B.1    \n\n", "OPEN\n",
-            "SP2\n", std::string("\x00\x06:\x00\x00\x00\x01\xFF", 8), std::string(2, '\0'),
-            "CLOSE\n", "REVC B.1    \n\n", "REBOOT\n"};
+        const std::vector<std::string> want = {"*CLS\n",
+                                               "DISPlay:CONFigure\n",
+                                               "SYSTem:ERRor?" + term,
+                                               "*IDN?" + term,
+                                               "MAINTENANCE:DOWNLOAD\n",
+                                               "REVD X.XX.XX\n\n",
+                                               "REVD B.1    \n\n",
+                                               "OPEN\n",
+                                               "SP2\n",
+                                               std::string("\x00\x06:\x00\x00\x00\x01\xFF", 8),
+                                               std::string(2, '\0'),
+                                               "CLOSE\n",
+                                               "REVC B.1    \n\n",
+                                               "REBOOT\n"};
         EXPECT_EQ(texts(w), want);
         // Identification at the user's settings, everything after the switch at 38400 8E1.
         for (std::size_t i = 0; i < w.port.sent.size(); ++i) {
@@ -89,7 +98,10 @@ TEST(Engine_Reception, AnswerLinesAndTheirChecks) {
         {"ready with LF CR and blank lines", 2, 0, "\n\nDOWNLOAD READY\n\r", O::Accepted},
         {"ready with a tab", 2, 0, "DOWNLOAD\t READY\r\n", O::Accepted},
         {"ready in lower case", 2, 0, "download ready\r\n", O::Ignored},
-        {"ready with control characters", 2, 0, "\x01" "DOWNLOAD READY\x07\r\n", O::Accepted},
+        {"ready with control characters", 2, 0,
+         "\x01"
+         "DOWNLOAD READY\x07\r\n",
+         O::Accepted},
         {"P2A", 4, 4, "P2A\r\n", O::Succeeded},
         {"P2A with prefix", 4, 4, "xP2A\r\n", O::Ignored},
         {"P2A with suffix", 4, 4, "P2AX\r\n", O::Refused},

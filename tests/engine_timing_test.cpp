@@ -73,9 +73,8 @@ TEST(Engine_Resends, MaintenanceResendFlipsParity) {
         std::string user;
         std::string resendAt;
     };
-    const Case cases[] = {{"9600,e,8,1", "9600,O,8,1"},
-                          {"9600,o,8,1", "9600,E,8,1"},
-                          {"19200,n,8,1", "19200,n,8,1"}};
+    const Case cases[] = {
+        {"9600,e,8,1", "9600,O,8,1"}, {"9600,o,8,1", "9600,E,8,1"}, {"19200,n,8,1", "19200,n,8,1"}};
     for (const Case& c : cases) {
         SCOPED_TRACE(c.user);
         SimWorld w({}, false);

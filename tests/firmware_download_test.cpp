@@ -11,7 +11,8 @@ using gen::Bytes;
 using test::FirmwareRig;
 
 // The records the instrument must hold per area, from the file's sections.
-std::map<std::string, std::vector<Bytes>> expectedAreas(const gen::FileSpec& spec, bool amps = true) {
+std::map<std::string, std::vector<Bytes>> expectedAreas(const gen::FileSpec& spec,
+                                                        bool amps = true) {
     const char* areas[] = {"P2", "P3", "P4", "P1"};
     std::map<std::string, std::vector<Bytes>> out;
     for (int i = 0; i < 4; ++i) {
@@ -161,10 +162,14 @@ TEST(Download_Failure, BadFileContentEndsTheTransferCleanly) {
         std::function<void(gen::FileSpec&)> spoil;
     };
     const Case cases[] = {
-        {"sections out of order", [](gen::FileSpec& s) { std::swap(s.sections[0], s.sections[1]); }},
-        {"record cut by the end marker", [](gen::FileSpec& s) { s.sections[3].records.pop_back(); }},
+        {"sections out of order",
+         [](gen::FileSpec& s) { std::swap(s.sections[0], s.sections[1]); }},
+        {"record cut by the end marker",
+         [](gen::FileSpec& s) { s.sections[3].records.pop_back(); }},
         {"record length below 6",
-         [](gen::FileSpec& s) { s.sections[1].records[2] = {0x3A, 0x00, 0x00, 0x00, 0x00}; }},
+         [](gen::FileSpec& s) {
+             s.sections[1].records[2] = {0x3A, 0x00, 0x00, 0x00, 0x00};
+         }},
         {"marker missing", [](gen::FileSpec& s) { s.sections[2].marker = "[AMP]"; }},
     };
     for (const Case& c : cases) {
@@ -229,9 +234,9 @@ TEST(Progress_Format, EstimatesAndRemainingTimes) {
         const char* text;
     };
     const Case cases[] = {
-        {1000000, 0, "11:00"}, {1000, 0, "02:40"},       {3000, 0, "02:42"},
-        {0, 0, "02:40"},       {1000000, 1000000, "02:40"},
-        {1000000, 370000, "07:55"},                      {0, 330000, "00:00"},
+        {1000000, 0, "11:00"}, {1000, 0, "02:40"},          {3000, 0, "02:42"},
+        {0, 0, "02:40"},       {1000000, 1000000, "02:40"}, {1000000, 370000, "07:55"},
+        {0, 330000, "00:00"},
     };
     for (const Case& c : cases) {
         EXPECT_EQ(FormatRemainingTime(EstimateSeconds(c.fileLength), c.bytesDone), c.text)

@@ -62,9 +62,9 @@ TEST(RevisionNumber_Values, ReadsNumberFromThirdCharacter) {
         double value;
     };
     const Case cases[] = {
-        {"A.01.02", 1.02},  {"B.02.10", 2.1},   {"?.??.??", 0.0}, {std::string(7, '\0'), 0.0},
-        {"X.XX.XX", 0.0},   {"A. 3.50", 3.5},   {"A.1    ", 1.0}, {"AB", 0.0},
-        {"C.10.00", 10.0},  {"A.02.00", 2.0},
+        {"A.01.02", 1.02}, {"B.02.10", 2.1}, {"?.??.??", 0.0}, {std::string(7, '\0'), 0.0},
+        {"X.XX.XX", 0.0},  {"A. 3.50", 3.5}, {"A.1    ", 1.0}, {"AB", 0.0},
+        {"C.10.00", 10.0}, {"A.02.00", 2.0},
     };
     for (const Case& c : cases) EXPECT_DOUBLE_EQ(RevisionNumber(c.text), c.value) << c.text;
     // The newer-or-equal warning compares the digits alone.
@@ -116,7 +116,8 @@ TEST(Texts_Tables, ExactTextsAtTheirIndexes) {
     EXPECT_EQ(t.QuestionTable[2], "OK to start the download?");
     EXPECT_EQ(t.QuestionTable[3], "OK to exit the download program?");
     int filled = 0;
-    for (int i = 0; i < kTextCount; ++i) filled += !t.MessageTable[i].empty() + !t.QuestionTable[i].empty();
+    for (int i = 0; i < kTextCount; ++i)
+        filled += !t.MessageTable[i].empty() + !t.QuestionTable[i].empty();
     EXPECT_EQ(filled, 10);
 }
 

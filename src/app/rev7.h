@@ -11,7 +11,7 @@ class Rev7 {
 public:
     static constexpr std::size_t kWidth = 7;
 
-    Rev7() = default;  // seven characters of code 0
+    Rev7() = default;                              // seven characters of code 0
     Rev7(std::string_view text) { assign(text); }  // NOLINT: assignment from text is the point
 
     Rev7& operator=(std::string_view text) {

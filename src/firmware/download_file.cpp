@@ -10,7 +10,9 @@ namespace zx917 {
 
 namespace {
 
-bool startsWith(const std::string& field, std::string_view tag) { return field.starts_with(tag); }
+bool startsWith(const std::string& field, std::string_view tag) {
+    return field.starts_with(tag);
+}
 
 bool failRead(const FileCheckParts& p) {
     p.file.close();

@@ -14,12 +14,12 @@
 namespace zx917 {
 
 struct Section {
-    const char* tag;          // header tag
-    const char* marker;       // pattern of the section's marker line
-    int16_t stage;            // command script stage that carries it
-    const char* select;       // select command, answered by the same text
-    const char* dataAnswer;   // answer to each record
-    const char* endAnswer;    // answer to the end of the area
+    const char* tag;         // header tag
+    const char* marker;      // pattern of the section's marker line
+    int16_t stage;           // command script stage that carries it
+    const char* select;      // select command, answered by the same text
+    const char* dataAnswer;  // answer to each record
+    const char* endAnswer;   // answer to the end of the area
 };
 
 inline constexpr std::array<Section, 4> SectionTable = {{

@@ -28,6 +28,8 @@ std::string FormatRemainingTime(int32_t estimatedSeconds, int32_t bytes) {
     return two(m) + ":" + two(c);
 }
 
-std::string ByteLabel(int32_t bytes) { return std::to_string(bytes) + "Byte"; }
+std::string ByteLabel(int32_t bytes) {
+    return std::to_string(bytes) + "Byte";
+}
 
 }  // namespace zx917

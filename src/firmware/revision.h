@@ -13,7 +13,9 @@ inline constexpr const char* kPlaceholderRevision = "X.XX.XX";
 
 // The decimal number that the text from its third character on begins with (1.02 for A.01.02).
 double RevisionNumber(std::string_view revision);
-inline double RevisionNumber(const Rev7& revision) { return RevisionNumber(revision.str()); }
+inline double RevisionNumber(const Rev7& revision) {
+    return RevisionNumber(revision.str());
+}
 
 // The text without its NUL, space and underscore characters.
 std::string StripFillers(std::string_view text);

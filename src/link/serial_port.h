@@ -12,9 +12,9 @@ namespace zx917 {
 // Codes of CommEvent.
 enum CommEventCode : int16_t {
     kCommEvNone = 0,
-    kCommEvSend = 1,     // the written bytes have left the port
-    kCommEvReceive = 2,  // bytes have arrived
-    kCommEvDsr = 4,      // the DSR line changed
+    kCommEvSend = 1,       // the written bytes have left the port
+    kCommEvReceive = 2,    // bytes have arrived
+    kCommEvDsr = 4,        // the DSR line changed
     kCommEvFailed = 1000,  // the port failed (device gone, write error); see errorText()
 };
 

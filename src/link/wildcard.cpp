@@ -15,7 +15,8 @@ bool matchOne(std::string_view pat, std::size_t p, unsigned char c, std::size_t&
     if (pc != '[') return static_cast<unsigned char>(pc) == c;
     std::size_t close = pat.find(']', p + 1);
     // "[]" and an unclosed bracket are plain characters.
-    if (close == std::string_view::npos || close == p + 1) return static_cast<unsigned char>(pc) == c;
+    if (close == std::string_view::npos || close == p + 1)
+        return static_cast<unsigned char>(pc) == c;
     len = close - p + 1;
     std::size_t i = p + 1;
     bool negate = false;

@@ -28,7 +28,9 @@ using Bytes = std::vector<uint8_t>;
 class Scheduler {
 public:
     int64_t now() const { return now_; }
-    void at(int64_t t, std::function<void()> fn) { items_.emplace(std::make_pair(t, seq_++), std::move(fn)); }
+    void at(int64_t t, std::function<void()> fn) {
+        items_.emplace(std::make_pair(t, seq_++), std::move(fn));
+    }
     bool runNext() {
         if (items_.empty()) return false;
         auto it = items_.begin();
@@ -52,8 +54,10 @@ public:
     explicit SimPump(Scheduler& s) : s_(s) {}
     void processNextEvent() override {
         ++turns;
-        if (!s_.runNext()) throw std::runtime_error("the program waits for an event that never comes");
-        if (s_.now() > limitMs) throw std::runtime_error("simulated time ran past the test's limit");
+        if (!s_.runNext())
+            throw std::runtime_error("the program waits for an event that never comes");
+        if (s_.now() > limitMs)
+            throw std::runtime_error("simulated time ran past the test's limit");
     }
     int64_t limitMs = 4LL * 3600 * 1000;
     int64_t turns = 0;

@@ -1,4 +1,5 @@
-// Builds download files of our own records (tests, demo, benchmarks): header, sections of Intel HEX or S-records, end marker.
+// Builds download files of our own records (tests, demo, benchmarks): header, sections of Intel HEX
+// or S-records, end marker.
 #pragma once
 
 #include <cstdint>
@@ -21,7 +22,9 @@ inline Bytes IntelRecord(uint8_t type, uint16_t address, const Bytes& data) {
     r.push_back(static_cast<uint8_t>(-sum & 0xFF));
     return r;
 }
-inline Bytes IntelEnd() { return IntelRecord(1, 0, {}); }
+inline Bytes IntelEnd() {
+    return IntelRecord(1, 0, {});
+}
 
 // An S-record in binary form: 'S', type, count, address (2, 3 or 4 bytes), data, checksum.
 inline Bytes SRecord(uint8_t type, uint32_t address, const Bytes& data) {
@@ -54,7 +57,8 @@ struct SectionSpec {
 };
 
 struct FileSpec {
-    std::string header = "A.01.02\r\nMDSP:A.01.02\r\nCDMA:A.01.02\r\nAMPS:A.01.02\r\nMPU:A.01.02\r\n";
+    std::string header =
+        "A.01.02\r\nMDSP:A.01.02\r\nCDMA:A.01.02\r\nAMPS:A.01.02\r\nMPU:A.01.02\r\n";
     std::vector<SectionSpec> sections;
     std::string trailer = "[EOF]\r\n";
 };
@@ -105,7 +109,8 @@ public:
     std::string write(const std::string& name, const Bytes& bytes) const {
         const std::string p = path_ + "/" + name;
         std::ofstream(p, std::ios::binary)
-            .write(reinterpret_cast<const char*>(bytes.data()), static_cast<std::streamsize>(bytes.size()));
+            .write(reinterpret_cast<const char*>(bytes.data()),
+                   static_cast<std::streamsize>(bytes.size()));
         return p;
     }
     std::string write(const std::string& name, const std::string& text) const {

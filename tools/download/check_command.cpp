@@ -28,12 +28,11 @@ bool checkOne(const std::string& path, const TextTables& texts) {
     std::cout << "  length: " << app.DownloadFileLength << " bytes\n";
     const FileScan scan = ScanDownloadFile(path, true);
     for (const SectionScan& s : scan.sections) {
-        std::cout << "  " << s.name << ": " << s.records << " records, " << s.bytes
-                  << " bytes\n";
+        std::cout << "  " << s.name << ": " << s.records << " records, " << s.bytes << " bytes\n";
     }
     if (!scan.ok) {
-        std::cout << "  read failure in section " << scan.section << " at offset "
-                  << scan.offset << ": " << scan.error << "\n";
+        std::cout << "  read failure in section " << scan.section << " at offset " << scan.offset
+                  << ": " << scan.error << "\n";
         std::cerr << path << ": " << scan.error << " (section " << scan.section << ", offset "
                   << scan.offset << ")\n";
     }

@@ -36,17 +36,24 @@ bool parse(const std::vector<std::string>& args, bool download, Options& o) {
     for (std::size_t i = 0; i < args.size(); ++i) {
         const std::string& a = args[i];
         const bool hasValue = i + 1 < args.size();
-        if (a == "--port" && hasValue) o.port = args[++i];
-        else if (a == "--settings" && hasValue) o.settings = args[++i];
-        else if (a == "--trace" && hasValue) o.trace = args[++i];
-        else if (a == "--file" && hasValue && download) o.file = args[++i];
+        if (a == "--port" && hasValue)
+            o.port = args[++i];
+        else if (a == "--settings" && hasValue)
+            o.settings = args[++i];
+        else if (a == "--trace" && hasValue)
+            o.trace = args[++i];
+        else if (a == "--file" && hasValue && download)
+            o.file = args[++i];
         else if (a == "--terminator" && hasValue) {
             const std::string t = args[++i];
             if (t != "crlf" && t != "cr" && t != "lf") return false;
             o.terminator = t == "cr" ? "\r" : t == "lf" ? "\n" : "\r\n";
-        } else if (a == "--xon") o.xon = true;
-        else if (a == "--yes" && download) o.yes = true;
-        else return false;
+        } else if (a == "--xon")
+            o.xon = true;
+        else if (a == "--yes" && download)
+            o.yes = true;
+        else
+            return false;
     }
     return !o.port.empty() && (!download || !o.file.empty()) && ParseLineSettings(o.settings);
 }
@@ -65,7 +72,10 @@ public:
         if (!o.trace.empty()) {
             trace = std::make_unique<TraceWriter>(o.trace);
             port.onTraffic = [this](bool sent, std::span<const uint8_t> bytes) {
-                trace->traffic(sent, bytes, port.settings() + (port.handshaking() ? " hs" + std::to_string(port.handshaking()) : ""));
+                trace->traffic(
+                    sent, bytes,
+                    port.settings() +
+                        (port.handshaking() ? " hs" + std::to_string(port.handshaking()) : ""));
             };
             engine.setTrace([this](const std::string& e) { trace->event(e); });
         }
@@ -172,8 +182,8 @@ int RunDownloadCommand(const std::vector<std::string>& args) {
     app.SelectedFileName = path.filename().string();
     app.HexFolder = path.parent_path().string();
     app.SelectedRevision = app.NewRevision;
-    std::cout << "new revision: " << Latin1ToUtf8(StripFillers(app.SelectedRevision.str()))
-              << " (" << app.SelectedFileName << ")\n";
+    std::cout << "new revision: " << Latin1ToUtf8(StripFillers(app.SelectedRevision.str())) << " ("
+              << app.SelectedFileName << ")\n";
     if (CurrentIsNewerOrEqual(app.CurrentRevision, app.SelectedRevision) &&
         !s.dialogs.question(s.texts.MessageTable[kMsgCurrentIsNewer])) {
         s.putPortBack();

@@ -9,10 +9,14 @@ std::string printable(const std::string& bytes) {
     std::string out;
     for (const char ch : bytes) {
         const auto c = static_cast<unsigned char>(ch);
-        if (c == '\r') out += "\\r";
-        else if (c == '\n') out += "\\n";
-        else if (c == '\\') out += "\\\\";
-        else if (c >= 0x20 && c < 0x7F) out += ch;
+        if (c == '\r')
+            out += "\\r";
+        else if (c == '\n')
+            out += "\\n";
+        else if (c == '\\')
+            out += "\\\\";
+        else if (c >= 0x20 && c < 0x7F)
+            out += ch;
         else {
             char buf[8];
             std::snprintf(buf, sizeof buf, "\\x%02X", c);
@@ -39,8 +43,8 @@ std::string TraceWriter::stamp() const {
 
 void TraceWriter::line(const std::string& kind, const std::string& settings,
                        const std::string& text, const std::string& at) {
-    out_ << (at.empty() ? stamp() : at) << ' ' << kind << (settings.empty() ? "" : " [" + settings + "]") << ' '
-         << text << '\n';
+    out_ << (at.empty() ? stamp() : at) << ' ' << kind
+         << (settings.empty() ? "" : " [" + settings + "]") << ' ' << text << '\n';
 }
 
 void TraceWriter::traffic(bool sent, std::span<const uint8_t> bytes, const std::string& settings) {

@@ -47,9 +47,9 @@ bool ParseFault(const std::string& text, Fault& f) {
     }
     if (parts.size() < 2 || parts.size() > 4 || parts[1].empty()) return false;
     static const std::map<std::string, FaultAction> kActions = {
-        {"silent", FaultAction::Silent}, {"abort", FaultAction::Abort},
-        {"garble", FaultAction::Garble}, {"refuse", FaultAction::Refuse},
-        {"dsr", FaultAction::Dsr},       {"hangup", FaultAction::Hangup},
+        {"silent", FaultAction::Silent},  {"abort", FaultAction::Abort},
+        {"garble", FaultAction::Garble},  {"refuse", FaultAction::Refuse},
+        {"dsr", FaultAction::Dsr},        {"hangup", FaultAction::Hangup},
         {"restart", FaultAction::Restart}};
     const auto it = kActions.find(parts[0]);
     if (it == kActions.end()) return false;
@@ -280,7 +280,8 @@ void Instrument::handleRecord(int64_t now) {
     if (fault == nullptr) fault = faultFor("DL", dlOccurrence);
     if (applyFault(fault, now)) return;
     areas_[area_].push_back(std::move(record));
-    const std::string ack = area_ + "A" + (fault && fault->action == FaultAction::Garble ? "#" : "");
+    const std::string ack =
+        area_ + "A" + (fault && fault->action == FaultAction::Garble ? "#" : "");
     answer(ack, now, last ? opt_.programDelayMs : -1);
 }
 

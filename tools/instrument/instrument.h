@@ -37,16 +37,16 @@ bool ParseFault(const std::string& text, Fault& fault);
 struct InstrumentOptions {
     std::string revision = "A.01.02";
     char ampsFlag = '1';
-    LineSettings userLine;  // 9600,n,8,1
+    LineSettings userLine;            // 9600,n,8,1
     std::string terminator = "\r\n";  // the line end the engineer set up on both sides
     int answerDelayMs = 2;
     int openDelayMs = 20;
-    int programDelayMs = 100;  // after the last record of an area
-    bool idnOnly = false;        // answers "*IDN?" and nothing else
-    bool noDownloadMode = false; // ignores "MAINTENANCE:DOWNLOAD"
-    bool wrongRevc = false;      // "REVC" answers with another revision
-    bool noise = false;          // noise lines and control characters before every answer
-    int readyAfterRevcMs = -1;   // an empty line this long after the REVC answer; -1: none
+    int programDelayMs = 100;     // after the last record of an area
+    bool idnOnly = false;         // answers "*IDN?" and nothing else
+    bool noDownloadMode = false;  // ignores "MAINTENANCE:DOWNLOAD"
+    bool wrongRevc = false;       // "REVC" answers with another revision
+    bool noise = false;           // noise lines and control characters before every answer
+    int readyAfterRevcMs = -1;    // an empty line this long after the REVC answer; -1: none
     std::vector<Fault> faults;
 };
 
@@ -78,9 +78,7 @@ public:
 
     const std::vector<CommandLog>& commands() const { return log_; }
     // Records accepted per area ("P1".."P4"), without their length bytes, latest pass only.
-    const std::map<std::string, std::vector<std::vector<uint8_t>>>& areas() const {
-        return areas_;
-    }
+    const std::map<std::string, std::vector<std::vector<uint8_t>>>& areas() const { return areas_; }
     const std::string& revision() const { return revision_; }
     char ampsFlag() const { return opt_.ampsFlag; }
     bool rebooted() const { return rebooted_; }
@@ -115,8 +113,8 @@ private:
     bool rebooted_ = false;
     bool confirmed_ = false;
     bool revcOk_ = false;
-    std::string area_;          // "P2" while records are expected
-    bool awaitingEcho_ = false; // after a restart request, until "RESTART:Pn" comes back
+    std::string area_;           // "P2" while records are expected
+    bool awaitingEcho_ = false;  // after a restart request, until "RESTART:Pn" comes back
     int areaRecord_ = 0;
     std::vector<uint8_t> rec_;  // record being received, length bytes first
     std::string text_;          // text line being received
@@ -126,8 +124,8 @@ private:
     std::vector<CommandLog> log_;
     std::vector<Emission> out_;
     std::string lastSettings_;
-    int64_t busyUntil_ = 0;  // answers keep their order
-    int64_t restartAt_ = -1; // when the instrument has restarted after REBOOT
+    int64_t busyUntil_ = 0;   // answers keep their order
+    int64_t restartAt_ = -1;  // when the instrument has restarted after REBOOT
     int restartsSent_ = 0;
     bool dead_ = false;
     Window window_;

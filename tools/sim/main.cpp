@@ -60,15 +60,24 @@ int64_t msSince(Clock::time_point start) {
 
 std::string baudText(speed_t s) {
     switch (s) {
-        case B1200: return "1200";
-        case B2400: return "2400";
-        case B4800: return "4800";
-        case B9600: return "9600";
-        case B19200: return "19200";
-        case B38400: return "38400";
-        case B57600: return "57600";
-        case B115200: return "115200";
-        default: return "?";
+        case B1200:
+            return "1200";
+        case B2400:
+            return "2400";
+        case B4800:
+            return "4800";
+        case B9600:
+            return "9600";
+        case B19200:
+            return "19200";
+        case B38400:
+            return "38400";
+        case B57600:
+            return "57600";
+        case B115200:
+            return "115200";
+        default:
+            return "?";
     }
 }
 
@@ -99,34 +108,60 @@ int main(int argc, char** argv) {
             }
             return argv[++i];
         };
-        if (a == "--link") link = next();
-        else if (a == "--revision") opt.revision = next();
+        if (a == "--link")
+            link = next();
+        else if (a == "--revision")
+            opt.revision = next();
         else if (a == "--settings") {
             auto s = zx917::ParseLineSettings(next());
-            if (!s) { std::cerr << "zx917-sim: bad --settings\n"; return 2; }
+            if (!s) {
+                std::cerr << "zx917-sim: bad --settings\n";
+                return 2;
+            }
             opt.userLine = *s;
         } else if (a == "--terminator") {
             const std::string t = next();
             opt.terminator = t == "cr" ? "\r" : t == "lf" ? "\n" : "\r\n";
-        } else if (a == "--amps-flag") opt.ampsFlag = next()[0];
-        else if (a == "--program-delay") opt.programDelayMs = std::atoi(next().c_str());
-        else if (a == "--open-delay") opt.openDelayMs = std::atoi(next().c_str());
-        else if (a == "--answer-delay") opt.answerDelayMs = std::atoi(next().c_str());
-        else if (a == "--idn-only") opt.idnOnly = true;
-        else if (a == "--no-download-mode") opt.noDownloadMode = true;
-        else if (a == "--wrong-revc") opt.wrongRevc = true;
-        else if (a == "--noise") opt.noise = true;
-        else if (a == "--quiet-after-revc") opt.readyAfterRevcMs = -1;
+        } else if (a == "--amps-flag")
+            opt.ampsFlag = next()[0];
+        else if (a == "--program-delay")
+            opt.programDelayMs = std::atoi(next().c_str());
+        else if (a == "--open-delay")
+            opt.openDelayMs = std::atoi(next().c_str());
+        else if (a == "--answer-delay")
+            opt.answerDelayMs = std::atoi(next().c_str());
+        else if (a == "--idn-only")
+            opt.idnOnly = true;
+        else if (a == "--no-download-mode")
+            opt.noDownloadMode = true;
+        else if (a == "--wrong-revc")
+            opt.wrongRevc = true;
+        else if (a == "--noise")
+            opt.noise = true;
+        else if (a == "--quiet-after-revc")
+            opt.readyAfterRevcMs = -1;
         else if (a == "--fault") {
             zx917::Fault f;
-            if (!zx917::ParseFault(next(), f)) { std::cerr << "zx917-sim: bad --fault\n"; return 2; }
+            if (!zx917::ParseFault(next(), f)) {
+                std::cerr << "zx917-sim: bad --fault\n";
+                return 2;
+            }
             opt.faults.push_back(f);
-        } else if (a == "--line-rate") lineRate = true;
-        else if (a == "--expect") expectFile = next();
-        else if (a == "--report") reportPath = next();
-        else if (a == "--once") once = true;
-        else if (a == "--help") { std::cout << kUsage; return 0; }
-        else { std::cerr << "zx917-sim: unknown option " << a << "\n" << kUsage; return 2; }
+        } else if (a == "--line-rate")
+            lineRate = true;
+        else if (a == "--expect")
+            expectFile = next();
+        else if (a == "--report")
+            reportPath = next();
+        else if (a == "--once")
+            once = true;
+        else if (a == "--help") {
+            std::cout << kUsage;
+            return 0;
+        } else {
+            std::cerr << "zx917-sim: unknown option " << a << "\n" << kUsage;
+            return 2;
+        }
     }
 
     const int master = ::posix_openpt(O_RDWR | O_NOCTTY);

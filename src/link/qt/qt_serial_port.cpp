@@ -20,10 +20,11 @@ QtSerialPort::QtSerialPort(QObject* parent) : QObject(parent) {
     connect(&drainCheck_, &QTimer::timeout, this, [this] { checkDrained(); });
     // Raised from the event loop, not inside QSerialPort's signal, so that a handler that waits
     // for further events (the engine's nested waits) still gets them.
-    connect(&port_, &QSerialPort::readyRead, this, [this] { queue(kCommEvReceive); },
-            Qt::QueuedConnection);
-    connect(&port_, &QSerialPort::bytesWritten, this, [this] { checkDrained(); },
-            Qt::QueuedConnection);
+    connect(
+        &port_, &QSerialPort::readyRead, this, [this] { queue(kCommEvReceive); },
+        Qt::QueuedConnection);
+    connect(
+        &port_, &QSerialPort::bytesWritten, this, [this] { checkDrained(); }, Qt::QueuedConnection);
     connect(&port_, &QSerialPort::errorOccurred, this, [this](QSerialPort::SerialPortError e) {
         if (e == QSerialPort::ResourceError || e == QSerialPort::WriteError ||
             e == QSerialPort::ReadError) {
@@ -123,8 +124,8 @@ bool QtSerialPort::output(std::span<const uint8_t> bytes) {
         error_ = "the port is not open";
         return false;
     }
-    const auto n = port_.write(reinterpret_cast<const char*>(bytes.data()),
-                               static_cast<qint64>(bytes.size()));
+    const auto n =
+        port_.write(reinterpret_cast<const char*>(bytes.data()), static_cast<qint64>(bytes.size()));
     if (n != static_cast<qint64>(bytes.size())) {
         error_ = port_.errorString().toStdString();
         return false;
@@ -193,7 +194,8 @@ void QtSerialPort::portFailed(const QString& why) {
 }
 
 void QtSerialPort::queue(int16_t code) {
-    QMetaObject::invokeMethod(this, [this, code] { raise(code); }, Qt::QueuedConnection);
+    QMetaObject::invokeMethod(
+        this, [this, code] { raise(code); }, Qt::QueuedConnection);
 }
 
 void QtSerialPort::raise(int16_t code) {
