@@ -14,6 +14,9 @@ inline constexpr const char* kHexFolderName = "HEX";
 inline constexpr const char* kHelpFileSuffix = ".HLP";
 inline constexpr const char* kClipFileName = "Filemove.avi";
 
+// The folder that holds the running executable (no trailing separator but at the root).
+std::string ProgramFolder();
+
 // Joins a folder and a name with one separator; a folder that is a root keeps its own.
 inline std::string JoinPath(const std::string& folder, const std::string& name) {
     if (folder.empty()) return name;

@@ -8,6 +8,7 @@
 
 #include "app/app_state.h"
 #include "app/file_slot.h"
+#include "app/identity.h"
 #include "app/texts.h"
 #include "download/cli_view.h"
 #include "download/commands.h"
@@ -68,7 +69,7 @@ public:
           ops(FirmwareParts{app, texts, dialogs, file, engine, port, timer1, view}) {
         InitMessages(texts);
         InitCommandScript(script);
-        InitDefaults(app, std::filesystem::current_path().string());
+        InitDefaults(app, ProgramFolder());
         if (!o.trace.empty()) {
             trace = std::make_unique<TraceWriter>(o.trace);
             port.onTraffic = [this](bool sent, std::span<const uint8_t> bytes) {
