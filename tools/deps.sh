@@ -16,7 +16,8 @@ ensure_deps() {
 }
 
 build_project() {
-    local dir="$1"; shift
-    cmake -S "$zx917_root" -B "$dir" -G Ninja -DCMAKE_BUILD_TYPE=RelWithDebInfo "$@" >/dev/null
+    local dir="$1"
+    shift
+    cmake -S "$zx917_root" -B "$dir" -G Ninja -DCMAKE_BUILD_TYPE=RelWithDebInfo ${1+"$@"} >/dev/null
     cmake --build "$dir" -j"$(nproc)"
 }
