@@ -127,10 +127,12 @@ TEST(Engine_Dsr, RiseEndsTheRunAndOnlyRebootKeepsItsResult) {
         start(w, c.stage, c.step);  // REBOOT goes out after its 40 s wait
         w.app.StepResult = c.resultBefore;
         const int64_t at = w.clock.now() + 500;
+        w.port.inject("P2", 200);  // a line begun before the restart can never end
         w.port.raiseDsr(500);
         w.engine.WaitForRunEnd();
         EXPECT_EQ(w.app.StepResult, c.resultAfter);
         EXPECT_FALSE(w.retry.enabled());
+        EXPECT_TRUE(w.app.LineBuffer.empty());
         EXPECT_TRUE(w.port.portOpen());  // reopened at the next tick of the wait timer
         EXPECT_GT(w.clock.now(), at);
         EXPECT_LE(w.clock.now(), at + 1000);

@@ -1,6 +1,6 @@
 # Installs the Debian packages the project needs, only when one is missing.
 zx917_packages=(cmake g++ ninja-build pkg-config qt6-base-dev qt6-serialport-dev
-    libgtest-dev libgmock-dev socat time python3)
+    libgtest-dev libgmock-dev socat time python3 clang libclang-rt-14-dev)
 
 ensure_deps() {
     local missing=()

@@ -107,6 +107,8 @@ void Engine::dsrBranch() {
     app_.WaitTicks = 1;
     while (app_.WaitTicks > 0) pump_.processNextEvent();
     const bool reopened = port_.setPortOpen(true);
+    // The rest of a line begun before the restart went with the closed port.
+    app_.LineBuffer.clear();
     app_.ScriptStep = kNoRun;
     retry_.setEnabled(false);
     if (wasRunning && !atReboot) {

@@ -1,0 +1,27 @@
+#!/usr/bin/env bash
+# Builds the fuzz targets with clang and runs each for SECONDS (60 by default); fails on any
+# crash, leak, hang or sanitizer report.
+set -euo pipefail
+seconds="${1:-60}"
+zx917_root="$(cd "$(dirname "$0")/../.." && pwd)"
+source "$zx917_root/tools/deps.sh"
+
+ensure_deps
+dir="$zx917_root/build-fuzz"
+CXX=clang++ build_project "$dir" -DZX917_FUZZ=ON -DCMAKE_CXX_COMPILER=clang++ >/dev/null
+corpus="$dir/corpus"
+bash "$zx917_root/tests/fuzz/make_seeds.sh" "$corpus" "$dir/tools/zx917-mkfile"
+status=0
+for target in download_file reception settings; do
+    echo "fuzz_$target: ${seconds}s"
+    if ! "$dir/tests/fuzz/fuzz_$target" "$corpus/$target" -max_total_time="$seconds" \
+        -timeout=20 -rss_limit_mb=2048 -print_final_stats=1 \
+        -artifact_prefix="$dir/fuzz_$target-" >"$dir/fuzz_$target.log" 2>&1; then
+        echo "fuzz_$target found a fault:" >&2
+        tail -40 "$dir/fuzz_$target.log" >&2
+        status=1
+    else
+        grep -E "stat::number_of_executed_units" "$dir/fuzz_$target.log" || true
+    fi
+done
+exit $status
