@@ -19,21 +19,21 @@ TEST(CheckTool_Verdicts, CountsRecordsAndFindsBadOnes) {
     gen::TempDir dir;
     struct Case {
         const char* name;
-        gen::FileSpec spec;
+        gen::FileLayout layout;
         int status;
         std::vector<std::string> expect;  // lines the output must hold
     };
-    gen::FileSpec intel;
+    gen::FileLayout intel;
     intel.sections = gen::StandardSections(3);
-    gen::FileSpec srec;
+    gen::FileLayout srec;
     srec.sections = gen::StandardSections(5, true, 20);
-    gen::FileSpec badSum = intel;
+    gen::FileLayout badSum = intel;
     badSum.sections[1].records[1].back() ^= 0x01;
-    gen::FileSpec cut = intel;
+    gen::FileLayout cut = intel;
     cut.sections[3].records.pop_back();  // MPU has no end record: runs into the end marker
-    gen::FileSpec noAmps = intel;
+    gen::FileLayout noAmps = intel;
     noAmps.sections.erase(noAmps.sections.begin() + 2);
-    gen::FileSpec oneRecord = intel;
+    gen::FileLayout oneRecord = intel;
     oneRecord.sections[0].records = {gen::IntelEnd()};
 
     const Case cases[] = {
@@ -50,7 +50,7 @@ TEST(CheckTool_Verdicts, CountsRecordsAndFindsBadOnes) {
     for (const Case& c : cases) {
         SCOPED_TRACE(c.name);
         int status = 0;
-        const std::string out = check(dir.write("T.HEX", gen::Build(c.spec)), status);
+        const std::string out = check(dir.write("T.HEX", gen::Build(c.layout)), status);
         EXPECT_EQ(status, c.status) << out;
         for (const auto& line : c.expect) EXPECT_NE(out.find(line), std::string::npos) << out;
     }

@@ -11,13 +11,13 @@ using gen::Bytes;
 using test::FirmwareRig;
 
 // The records the instrument must hold per area, from the file's sections.
-std::map<std::string, std::vector<Bytes>> expectedAreas(const gen::FileSpec& spec,
+std::map<std::string, std::vector<Bytes>> expectedAreas(const gen::FileLayout& layout,
                                                         bool amps = true) {
     const char* areas[] = {"P2", "P3", "P4", "P1"};
     std::map<std::string, std::vector<Bytes>> out;
     for (int i = 0; i < 4; ++i) {
         if (i == 2 && !amps) continue;
-        out[areas[i]] = spec.sections[i].records;
+        out[areas[i]] = layout.sections[i].records;
     }
     return out;
 }
@@ -32,17 +32,17 @@ void expectUserPortAndQuietTimers(const FirmwareRig& r) {
 TEST(Download_Success, FilesArriveByteExactInTheirAreas) {
     struct Case {
         const char* name;
-        gen::FileSpec spec;
+        gen::FileLayout layout;
         InstrumentOptions options;
         bool amps;
     };
-    gen::FileSpec intel;
+    gen::FileLayout intel;
     intel.sections = gen::StandardSections(6);
-    gen::FileSpec srec;
+    gen::FileLayout srec;
     srec.sections = gen::StandardSections(4, true, 24);
-    gen::FileSpec single = intel;
+    gen::FileLayout single = intel;
     single.sections[1].records = {gen::IntelEnd()};
-    gen::FileSpec bigRecords;
+    gen::FileLayout bigRecords;
     bigRecords.sections = gen::StandardSections(2, false, 250);
     InstrumentOptions noAmps;
     noAmps.ampsFlag = '0';
@@ -64,13 +64,13 @@ TEST(Download_Success, FilesArriveByteExactInTheirAreas) {
     for (const Case& c : cases) {
         SCOPED_TRACE(c.name);
         FirmwareRig r(c.options);
-        r.choose(gen::Build(c.spec));
+        r.choose(gen::Build(c.layout));
         EXPECT_TRUE(r.download());
         EXPECT_EQ(r.view.pages.back(), 5);
         EXPECT_TRUE(r.dialogs.shown.empty());
         EXPECT_TRUE(r.world.instrument->confirmed());
         EXPECT_EQ(r.world.instrument->revision(), "A.02.00");
-        EXPECT_EQ(r.world.instrument->areas(), expectedAreas(c.spec, c.amps));
+        EXPECT_EQ(r.world.instrument->areas(), expectedAreas(c.layout, c.amps));
         EXPECT_EQ(r.view.remTime4, "00:00");
         EXPECT_EQ(r.world.sendsOf("REBOOT").size(), 1u);
         EXPECT_EQ(r.world.port.sent.back().text(), "REBOOT\n");
@@ -87,9 +87,9 @@ TEST(Download_Success, ByteCountStepsBackAfterARestart) {
     ParseFault("restart:P2:4:1", f);
     o.faults = {f};
     FirmwareRig r(o);
-    gen::FileSpec spec;
-    spec.sections = gen::StandardSections(6);
-    r.choose(gen::Build(spec));
+    gen::FileLayout layout;
+    layout.sections = gen::StandardSections(6);
+    r.choose(gen::Build(layout));
     ASSERT_TRUE(r.download());
     const auto& v = r.view.progressValues;
     bool steppedBack = false;
@@ -99,7 +99,7 @@ TEST(Download_Success, ByteCountStepsBackAfterARestart) {
     EXPECT_EQ(r.world.sendsOf("SP2").size(), 1u);  // no second select after a restart
     // The shown count is a file position: it never reaches the length (end marker unread).
     EXPECT_LT(v.back(), r.view.progressMax);
-    EXPECT_EQ(r.view.progressMax, static_cast<int32_t>(gen::Build(spec).size()));
+    EXPECT_EQ(r.view.progressMax, static_cast<int32_t>(gen::Build(layout).size()));
 }
 
 TEST(Download_Failure, EveryFaultEndsWithTheMessageOnPageZero) {
@@ -142,9 +142,9 @@ TEST(Download_Failure, EveryFaultEndsWithTheMessageOnPageZero) {
             o.faults = {f};
         }
         FirmwareRig r(o);
-        gen::FileSpec spec;
-        spec.sections = gen::StandardSections(6);
-        r.choose(gen::Build(spec));
+        gen::FileLayout layout;
+        layout.sections = gen::StandardSections(6);
+        r.choose(gen::Build(layout));
         EXPECT_FALSE(r.download());
         const std::vector<test::FakeDialogs::Shown> want = {{"critical", "Download failed."}};
         EXPECT_EQ(r.dialogs.shown, want);
@@ -159,26 +159,26 @@ TEST(Download_Failure, EveryFaultEndsWithTheMessageOnPageZero) {
 TEST(Download_Failure, BadFileContentEndsTheTransferCleanly) {
     struct Case {
         const char* name;
-        std::function<void(gen::FileSpec&)> spoil;
+        std::function<void(gen::FileLayout&)> spoil;
     };
     const Case cases[] = {
         {"sections out of order",
-         [](gen::FileSpec& s) { std::swap(s.sections[0], s.sections[1]); }},
+         [](gen::FileLayout& s) { std::swap(s.sections[0], s.sections[1]); }},
         {"record cut by the end marker",
-         [](gen::FileSpec& s) { s.sections[3].records.pop_back(); }},
+         [](gen::FileLayout& s) { s.sections[3].records.pop_back(); }},
         {"record length below 6",
-         [](gen::FileSpec& s) {
+         [](gen::FileLayout& s) {
              s.sections[1].records[2] = {0x3A, 0x00, 0x00, 0x00, 0x00};
          }},
-        {"marker missing", [](gen::FileSpec& s) { s.sections[2].marker = "[AMP]"; }},
+        {"marker missing", [](gen::FileLayout& s) { s.sections[2].marker = "[AMP]"; }},
     };
     for (const Case& c : cases) {
         SCOPED_TRACE(c.name);
         FirmwareRig r;
-        gen::FileSpec spec;
-        spec.sections = gen::StandardSections(4);
-        c.spoil(spec);
-        r.choose(gen::Build(spec));
+        gen::FileLayout layout;
+        layout.sections = gen::StandardSections(4);
+        c.spoil(layout);
+        r.choose(gen::Build(layout));
         EXPECT_FALSE(r.download());
         const std::vector<test::FakeDialogs::Shown> want = {{"critical", "Download failed."}};
         EXPECT_EQ(r.dialogs.shown, want);
@@ -190,9 +190,9 @@ TEST(Download_Failure, BadFileContentEndsTheTransferCleanly) {
 
 TEST(Download_Failure, FileGoneBeforeTheStart) {
     FirmwareRig r;
-    gen::FileSpec spec;
-    spec.sections = gen::StandardSections(2);
-    r.choose(gen::Build(spec));
+    gen::FileLayout layout;
+    layout.sections = gen::StandardSections(2);
+    r.choose(gen::Build(layout));
     ASSERT_TRUE(r.ops.ReadCurrentRevision());
     ASSERT_TRUE(r.ops.PrepareDownload());
     std::remove(r.world.app.FilePath.c_str());
@@ -209,9 +209,9 @@ TEST(Download_Progress, ProgrammingClimbsBy255UpToTheMaximum) {
     InstrumentOptions o;
     o.programDelayMs = 3000;
     FirmwareRig r(o);
-    gen::FileSpec spec;
-    spec.sections = gen::StandardSections(300);
-    r.choose(gen::Build(spec));
+    gen::FileLayout layout;
+    layout.sections = gen::StandardSections(300);
+    r.choose(gen::Build(layout));
     ASSERT_TRUE(r.download());
     // While an area is programmed the label climbs 255 a tick, never past the bar's maximum.
     int climbs = 0;

@@ -61,9 +61,9 @@ TEST(Identify_Outcomes, StagesRevisionAndPortSettings) {
 
 TEST(Identify_Prepare, EstimateShownAndBadFileSendsBackToPageTwo) {
     FirmwareRig r;
-    gen::FileSpec spec;
-    spec.sections = gen::StandardSections(2);
-    r.choose(gen::Build(spec), "A.02.00");
+    gen::FileLayout layout;
+    layout.sections = gen::StandardSections(2);
+    r.choose(gen::Build(layout), "A.02.00");
     EXPECT_TRUE(r.ops.PrepareDownload());
     EXPECT_EQ(r.world.app.NewRevision.str(), "A.02.00");
     EXPECT_EQ(r.ops.EstimatedTime, 160);

@@ -51,25 +51,25 @@ inline Bytes DataBytes(std::size_t n, uint8_t seed) {
     return d;
 }
 
-struct SectionSpec {
+struct SectionLayout {
     std::string marker;          // e.g. "[MDSP]"
     std::vector<Bytes> records;  // unframed
 };
 
-struct FileSpec {
+struct FileLayout {
     std::string header =
         "A.01.02\r\nMDSP:A.01.02\r\nCDMA:A.01.02\r\nAMPS:A.01.02\r\nMPU:A.01.02\r\n";
-    std::vector<SectionSpec> sections;
+    std::vector<SectionLayout> sections;
     std::string trailer = "[EOF]\r\n";
 };
 
 // Sections of n data records each, ending with an end record, in Intel HEX or S-record form.
-inline std::vector<SectionSpec> StandardSections(int recordsPerSection, bool srecords = false,
+inline std::vector<SectionLayout> StandardSections(int recordsPerSection, bool srecords = false,
                                                  std::size_t dataLen = 16) {
-    std::vector<SectionSpec> out;
+    std::vector<SectionLayout> out;
     const char* markers[] = {"[MDSP]", "[CDMA]", "[AMPS]", "[MPU]"};
     for (int s = 0; s < 4; ++s) {
-        SectionSpec sec{markers[s], {}};
+        SectionLayout sec{markers[s], {}};
         for (int i = 0; i < recordsPerSection; ++i) {
             const auto data = DataBytes(dataLen, static_cast<uint8_t>(s * 40 + i));
             const auto addr = static_cast<uint16_t>(i * dataLen);
@@ -81,9 +81,9 @@ inline std::vector<SectionSpec> StandardSections(int recordsPerSection, bool sre
     return out;
 }
 
-inline Bytes Build(const FileSpec& spec) {
-    Bytes out(spec.header.begin(), spec.header.end());
-    for (const auto& sec : spec.sections) {
+inline Bytes Build(const FileLayout& layout) {
+    Bytes out(layout.header.begin(), layout.header.end());
+    for (const auto& sec : layout.sections) {
         const std::string line = sec.marker + "\r\n";
         out.insert(out.end(), line.begin(), line.end());
         for (const auto& r : sec.records) {
@@ -91,7 +91,7 @@ inline Bytes Build(const FileSpec& spec) {
             out.insert(out.end(), f.begin(), f.end());
         }
     }
-    out.insert(out.end(), spec.trailer.begin(), spec.trailer.end());
+    out.insert(out.end(), layout.trailer.begin(), layout.trailer.end());
     return out;
 }
 

@@ -33,11 +33,11 @@ int main(int argc, char** argv) {
     }
     constexpr std::size_t kData = 32;  // data bytes per record, as linkers commonly write
     const long perSection = std::max(1L, bytes / 4 / 39);
-    zx917::gen::FileSpec spec;
-    spec.header = revision + "\r\nMDSP:" + revision + "\r\nCDMA:" + revision +
+    zx917::gen::FileLayout layout;
+    layout.header = revision + "\r\nMDSP:" + revision + "\r\nCDMA:" + revision +
                   "\r\nAMPS:" + revision + "\r\nMPU:" + revision + "\r\n";
-    spec.sections = zx917::gen::StandardSections(static_cast<int>(perSection), srec, kData);
-    const auto data = zx917::gen::Build(spec);
+    layout.sections = zx917::gen::StandardSections(static_cast<int>(perSection), srec, kData);
+    const auto data = zx917::gen::Build(layout);
     std::ofstream f(out, std::ios::binary);
     f.write(reinterpret_cast<const char*>(data.data()), static_cast<std::streamsize>(data.size()));
     if (!f) {
