@@ -19,6 +19,7 @@ export ZX917_TICK_MS=20
 "$bin/zx917-mkfile" --bytes 8000 "$work/NEW.HEX" >/dev/null
 
 # name | simulator options | outcome: ok, failed (transfer) or noport (identification)
+#      | the program's own options, when they differ from the defaults
 matrix=(
     "plain||ok"
     "noise|--noise|ok"
@@ -27,7 +28,13 @@ matrix=(
     "long programming delay|--program-delay 600|ok"
     "line rate|--line-rate|ok"
     "quiet after REVC|--quiet-after-revc|ok"
-    "terminator LF|--terminator lf|ok:--terminator lf"
+    "terminator LF|--terminator lf|ok|--terminator lf"
+    "terminator CR|--terminator cr|ok|--terminator cr"
+    "instrument at 19200 8E1|--settings 19200,e,8,1|ok|--settings 19200,e,8,1"
+    "XON/XOFF on the user's line||ok|--xon"
+    "settings that differ from the instrument's|--settings 19200,n,8,1|noport"
+    "slow OPEN|--open-delay 800|ok"
+    "slow answers|--answer-delay 30|ok"
     "restart once|--fault restart:P2:3:1|ok"
     "restart twice|--fault restart:P4:2:2|ok"
     "restart three times|--fault restart:P1:2:3|failed"
@@ -69,9 +76,15 @@ matrix=(
 )
 
 for row in "${matrix[@]}"; do
-    IFS='|' read -r name simargs outcome <<<"$row"
-    extra=()
-    case "$outcome" in ok:*) extra=(${outcome#ok:}); outcome=ok ;; esac
+    IFS='|' read -r name simargs outcome progargs <<<"$row"
+    # shellcheck disable=SC2206
+    extra=($progargs)
+    user_settings=9600,n,8,1
+    user_hs=0
+    for ((i = 0; i < ${#extra[@]}; i++)); do
+        [ "${extra[$i]}" = --settings ] && user_settings="${extra[$((i + 1))]}"
+        [ "${extra[$i]}" = --xon ] && user_hs=1
+    done
     cases=$((cases + 1))
     rm -f "$work/com1" "$work/report.json" "$work/trace.txt"
     # shellcheck disable=SC2086
@@ -107,7 +120,7 @@ for row in "${matrix[@]}"; do
     { [ "$rc" = 0 ] && [ "$confirmed" = true ]; } || { [ "$rc" != 0 ] && [ "$confirmed" != true ]; } ||
         problems+=("exit $rc but the instrument's confirmation is '$confirmed'")
     last=$(grep "port closed at" "$work/trace.txt" | tail -1)
-    [[ "$last" == *"port closed at 9600,n,8,1 handshaking 0" ]] ||
+    [[ "$last" == *"port closed at $user_settings handshaking $user_hs" ]] ||
         problems+=("port not put back: '$last'")
     pgrep -f "$work/com1" >/dev/null && problems+=("a process was left behind")
     if [ ${#problems[@]} -eq 0 ]; then
