@@ -48,6 +48,7 @@ identify)
     # Entered at the user's speed, answered at the download speed.
     expect_in '{"command": "MAINTENANCE:DOWNLOAD", "settings": "9600,*,*,1"' "$work/report.json"
     expect_in '{"command": "REVD X.XX.XX", "settings": "38400,*,*,1"' "$work/report.json"
+    expect_not_in "answer lost" "$work/sim.err"
     ;;
 download-intel | download-srec)
     args=(--bytes 40000)
