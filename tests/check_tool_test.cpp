@@ -41,7 +41,7 @@ TEST(CheckTool_Verdicts, CountsRecordsAndFindsBadOnes) {
          intel,
          0,
          {"revision: A.01.02", "MDSP: 4 records, 80 bytes", "MPU: 4 records, 80 bytes"}},
-        {"srec", srec, 0, {"CDMA: 6 records, 149 bytes"}},
+        {"srec", srec, 0, {"CDMA: 6 records, 154 bytes"}},
         {"one-record section", oneRecord, 0, {"MDSP: 1 records, 8 bytes"}},
         {"bad checksum", badSum, 1, {"read failure in section CDMA at offset", "checksum"}},
         {"cut short", cut, 1, {"read failure in section MPU"}},

@@ -63,17 +63,29 @@ struct FileLayout {
     std::string trailer = "[EOF]\r\n";
 };
 
-// Sections of n data records each, ending with an end record, in Intel HEX or S-record form.
+// Sections of n data records each, ending with an end record. Intel HEX sections carry an
+// extended linear address record whenever the upper 16 address bits change; S-records use
+// 24-bit addresses (S2) and end with S8.
 inline std::vector<SectionLayout> StandardSections(int recordsPerSection, bool srecords = false,
-                                                 std::size_t dataLen = 16) {
+                                                   std::size_t dataLen = 16) {
     std::vector<SectionLayout> out;
     const char* markers[] = {"[MDSP]", "[CDMA]", "[AMPS]", "[MPU]"};
     for (int s = 0; s < 4; ++s) {
         SectionLayout sec{markers[s], {}};
+        uint32_t upper = 0;
         for (int i = 0; i < recordsPerSection; ++i) {
             const auto data = DataBytes(dataLen, static_cast<uint8_t>(s * 40 + i));
-            const auto addr = static_cast<uint16_t>(i * dataLen);
-            sec.records.push_back(srecords ? SRecord(1, addr, data) : IntelRecord(0, addr, data));
+            const auto addr = static_cast<uint32_t>(i * dataLen);
+            if (srecords) {
+                sec.records.push_back(SRecord(2, addr, data));
+                continue;
+            }
+            if ((addr >> 16) != upper) {
+                upper = addr >> 16;
+                sec.records.push_back(IntelRecord(
+                    4, 0, {static_cast<uint8_t>(upper >> 8), static_cast<uint8_t>(upper)}));
+            }
+            sec.records.push_back(IntelRecord(0, static_cast<uint16_t>(addr), data));
         }
         sec.records.push_back(srecords ? SRecord(8, 0, {}) : IntelEnd());
         out.push_back(sec);

@@ -44,6 +44,8 @@ int main(int argc, char** argv) {
         std::cerr << "zx917-mkfile: could not write " << out << "\n";
         return 1;
     }
-    std::cout << out << ": " << data.size() << " bytes, " << 4 * (perSection + 1) << " records\n";
+    std::size_t records = 0;
+    for (const auto& section : layout.sections) records += section.records.size();
+    std::cout << out << ": " << data.size() << " bytes, " << records << " records\n";
     return 0;
 }
