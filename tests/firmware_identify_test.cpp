@@ -59,6 +59,22 @@ TEST(Identify_Outcomes, StagesRevisionAndPortSettings) {
     EXPECT_EQ(amps.world.app.AmpsSectionFlag, "0");
 }
 
+TEST(Identify_Outcomes, IdentifiedWithoutDownloadModeKeepsTheUsersSettings) {
+    InstrumentOptions o;
+    o.idnOnly = true;
+    o.userLine = LineSettings{19200, 'e', 7, "1"};
+    FirmwareRig r(o);
+    r.world.port.setSettings("19200,e,7,1");
+    r.world.port.setHandshaking(1);
+    gen::FileLayout layout;
+    layout.sections = gen::StandardSections(2);
+    r.choose(gen::Build(layout));
+    EXPECT_FALSE(r.download());  // not in download mode: "REVD" is never answered
+    EXPECT_EQ(r.view.pages.back(), 0);
+    EXPECT_EQ(r.world.port.settings(), "19200,e,7,1");
+    EXPECT_EQ(r.world.port.handshaking(), 1);
+}
+
 TEST(Identify_Prepare, EstimateShownAndBadFileSendsBackToPageTwo) {
     FirmwareRig r;
     gen::FileLayout layout;

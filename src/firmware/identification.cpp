@@ -8,6 +8,10 @@ namespace zx917 {
 bool FirmwareOperations::ReadCurrentRevision() {
     AppState& app = p_.app;
     p_.view.setSettingsControlsEnabled(false);
+    // The settings to put back later are the engineer's, also when the instrument is identified
+    // without the download mode (the switch to the download speed saves them again).
+    app.PortSettings = p_.port.settings();
+    app.PortHandshaking = p_.port.handshaking();
     app.NewRevision = kPlaceholderRevision;
     app.StepResult = false;
     p_.engine.RunStage(kStageIdentify, 0);
