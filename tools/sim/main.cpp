@@ -244,8 +244,9 @@ int main(int argc, char** argv) {
                 // Judged at the settings they were written at; bytes written just before a
                 // speed change still count as sent at the old settings.
                 const std::string now = current();
-                const bool ok = matches(now) || (now != prevSettings && matches(prevSettings));
-                in.push_back({due, std::vector<uint8_t>(buf, buf + n), now, ok});
+                const bool early = !matches(now) && now != prevSettings && matches(prevSettings);
+                const std::string at = early ? prevSettings : now;
+                in.push_back({due, std::vector<uint8_t>(buf, buf + n), at, matches(at)});
             }
         }
         // Bytes that have fully arrived go to the instrument at the settings of the moment;
