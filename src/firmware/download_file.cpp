@@ -10,10 +10,6 @@ namespace zx917 {
 
 namespace {
 
-bool startsWith(const std::string& field, std::string_view tag) {
-    return field.starts_with(tag);
-}
-
 bool failRead(const FileCheckParts& p) {
     p.file.close();
     p.dialogs.beep();
@@ -36,10 +32,10 @@ std::optional<bool> CheckFileHeader(const FileCheckParts& p) {
     if (length < kMinDownloadFileLength) return false;
     std::string field;
     if (!p.file.readField(field) || !p.file.readField(field)) return std::nullopt;
-    if (!startsWith(field, SectionTable[0].tag)) return false;
+    if (!field.starts_with(SectionTable[0].tag)) return false;
     for (std::size_t i = 1; i < SectionTable.size(); ++i) {
         if (!p.file.readField(field)) return std::nullopt;
-        if (!startsWith(field, SectionTable[i].tag)) return false;
+        if (!field.starts_with(SectionTable[i].tag)) return false;
     }
     if (!p.file.seek(1)) return std::nullopt;
     return true;

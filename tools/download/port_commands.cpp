@@ -28,7 +28,16 @@ namespace zx917 {
 
 namespace {
 
-int tickMs(int normalMs);
+// The test build can run the timers faster (ZX917_TICK_MS: the length of a 1000 ms tick), so
+// that the fault matrix's time-outs pass in seconds; the shipped program keeps real time.
+int tickMs(int normalMs) {
+#ifdef ZX917_TEST_TICK
+    if (const char* t = std::getenv("ZX917_TICK_MS"); t != nullptr && std::atoi(t) > 0) {
+        return std::max(1, normalMs * std::atoi(t) / 1000);
+    }
+#endif
+    return normalMs;
+}
 
 struct Options {
     std::string port, settings = kDefaultSettings, terminator = kDefaultTerminator, trace, file;
@@ -133,17 +142,6 @@ public:
     FirmwareOperations ops;
     std::unique_ptr<TraceWriter> trace;
 };
-
-// The test build can run the timers faster (ZX917_TICK_MS: the length of a 1000 ms tick), so
-// that the fault matrix's time-outs pass in seconds; the shipped program keeps real time.
-int tickMs(int normalMs) {
-#ifdef ZX917_TEST_TICK
-    if (const char* t = std::getenv("ZX917_TICK_MS"); t != nullptr && std::atoi(t) > 0) {
-        return std::max(1, normalMs * std::atoi(t) / 1000);
-    }
-#endif
-    return normalMs;
-}
 
 int usage(const char* command) {
     std::cerr << "zx917-download " << command << ": bad options (see --help)\n";
