@@ -132,7 +132,8 @@ TEST(Engine_Reception, AnswerLinesAndTheirChecks) {
         w.engine.SendStep();
         const int16_t armedStep = w.app.ScriptStep;
         w.app.ElapsedTicks = 1;
-        w.app.StepResult = c.outcome == O::Failed;
+        // A refused line must turn a previous success into False, not only restart the count.
+        w.app.StepResult = c.outcome == O::Failed || c.outcome == O::Refused;
         w.port.inject(c.line, 100);
         while (w.clock.nextAt() < 1000) w.pump.processNextEvent();
         switch (c.outcome) {
@@ -152,6 +153,9 @@ TEST(Engine_Reception, AnswerLinesAndTheirChecks) {
                 EXPECT_EQ(w.app.ScriptStep, armedStep);
                 EXPECT_EQ(w.app.ElapsedTicks, c.outcome == O::Refused ? 0 : 1);
                 EXPECT_TRUE(w.retry.enabled());
+                if (c.outcome == O::Refused) {
+                    EXPECT_FALSE(w.app.StepResult);
+                }
                 break;
         }
     }

@@ -139,6 +139,40 @@ TEST(Engine_Dsr, RiseEndsTheRunAndOnlyRebootKeepsItsResult) {
     }
 }
 
+// While the DSR recovery waits with the port closed, a resend falling due must not fail the run:
+// the instrument restarting after "REBOOT" is the download's success.
+TEST(Engine_Dsr, ResendFallingDueDuringTheRecoveryChangesNothing) {
+    for (const int64_t riseMs : {4200, 4500, 4900}) {  // REBOOT's resend is due 5 s after it
+        SCOPED_TRACE(riseMs);
+        SimWorld w({}, false);
+        start(w, 8, 2);
+        const int64_t rebootAt = w.clock.now();
+        w.app.StepResult = true;  // REVC confirmed the new revision
+        w.port.raiseDsr(riseMs);
+        w.engine.WaitForRunEnd();
+        EXPECT_TRUE(w.app.StepResult);
+        EXPECT_EQ(w.port.sent.size(), 1u);  // REBOOT once, no resend on the closed port
+        EXPECT_TRUE(w.port.portOpen());
+        EXPECT_FALSE(w.retry.enabled());
+        EXPECT_LE(w.clock.now(), rebootAt + riseMs + 1000);
+    }
+}
+
+// A restart request while the peer holds the line stopped: the output never drains, so the
+// drain must end with the run (its give-up), not turn the event loop for ever.
+TEST(Engine_Restart, DrainEndsWithTheRunOnAHeldLine) {
+    SimWorld w({}, false);
+    start(w, 4, 4);  // a record on its way
+    w.port.lineHeld = true;
+    w.port.inject("RESTART:P2\r\n", 1);
+    w.app.StepResult = true;
+    w.engine.WaitForRunEnd();
+    EXPECT_FALSE(w.app.StepResult);
+    EXPECT_FALSE(w.app.RestartRequested);
+    EXPECT_EQ(w.clock.now(), 21000);  // the record's own give-up
+    EXPECT_FALSE(w.retry.enabled());
+}
+
 TEST(Engine_PortFailure, VanishedPortOrFailedWriteEndsTheRun) {
     {
         SimWorld w({}, false);

@@ -91,7 +91,8 @@ TEST(Engine_Resends, MaintenanceResendFlipsParity) {
         // After each send the line goes to the download speed.
         EXPECT_EQ(w.port.settings(), "38400,E,8,1");
         EXPECT_EQ(w.port.handshaking(), 3);
-        EXPECT_EQ(w.app.PortSettings, c.resendAt);
+        // Nobody answered the flipped parity: the settings kept for the way back are the user's.
+        EXPECT_EQ(w.app.PortSettings, c.user);
     }
 }
 

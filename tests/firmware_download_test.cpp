@@ -156,6 +156,31 @@ TEST(Download_Failure, EveryFaultEndsWithTheMessageOnPageZero) {
     }
 }
 
+// The instrument asks to restart an area while the line is stopped by its flow control.
+TEST(Download_Failure, RestartOnAHeldLineEndsWithTheMessage) {
+    FirmwareRig r;
+    gen::FileLayout layout;
+    layout.sections = gen::StandardSections(6);
+    r.choose(gen::Build(layout));
+    ASSERT_TRUE(r.ops.ReadCurrentRevision());
+    ASSERT_TRUE(r.ops.PrepareDownload());
+    auto& port = r.world.port;
+    int records = 0;
+    port.onSent = [&](const test::Sent& s) {
+        if (r.world.app.ScriptStage != 4 || s.bytes.size() < 3 || s.bytes[2] != 0x3A) return;
+        if (++records != 3) return;
+        port.lineHeld = true;  // the third record stays queued
+        port.inject("RESTART:P2\r\n", 1);
+    };
+    const int64_t from = r.world.clock.now();
+    EXPECT_FALSE(r.ops.StartDownload());
+    EXPECT_EQ(r.dialogs.shown.back().text, "Download failed.");
+    EXPECT_EQ(r.view.pages.back(), 0);
+    EXPECT_LE(r.world.clock.now() - from, 30000);
+    port.lineHeld = false;
+    expectUserPortAndQuietTimers(r);
+}
+
 TEST(Download_Failure, BadFileContentEndsTheTransferCleanly) {
     struct Case {
         const char* name;

@@ -48,6 +48,13 @@ void Engine::FailRun(const std::string& why) {
     app_.ScriptStep = kNoRun;
     app_.LineBuffer.clear();
     app_.LastCommand.clear();
+    forgetRun();
+}
+
+void Engine::forgetRun() {
+    // A switch left pending would move the next run's first command to the download speed.
+    app_.SpeedSwitchPending = 0;
+    flippedSettings_.clear();
 }
 
 void Engine::MSComm1_OnComm() {

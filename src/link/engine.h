@@ -80,6 +80,9 @@ private:
     void receiveBranch();
     void dsrBranch();
     void abortRun(const std::string& why);
+    // Every way a run ends: nothing of it may act on the next run.
+    void forgetRun();
+    void keepFlippedParity();
     void restartArea(const std::string& request);
     void note(const std::string& text) const {
         if (trace_) trace_(text);
@@ -94,6 +97,9 @@ private:
     EventPump& pump_;
     FileSlot& file_;
     bool resending_ = false;  // SendStep called by Retry_Timer for a resend
+    // The settings of the last resend of "MAINTENANCE:DOWNLOAD", at the flipped parity; empty
+    // when the line has not been flipped in this run.
+    std::string flippedSettings_;
     std::function<void(const std::string&)> trace_;
 };
 

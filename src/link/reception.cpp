@@ -1,4 +1,6 @@
 // Line reception and answer matching: the receive branch, ReadLine, MatchAnswer and the checks.
+#include <cctype>
+
 #include "link/engine.h"
 #include "link/wildcard.h"
 
@@ -51,6 +53,7 @@ void Engine::MatchAnswer() {
             app_.LastCommand.clear();
             app_.ScriptStep = kNoRun;
             retry_.setEnabled(false);
+            forgetRun();
             return;
         }
     } else {
@@ -72,6 +75,9 @@ void Engine::MatchAnswer() {
     }
 
     if (r) {
+        if (e.Command == "MAINTENANCE:DOWNLOAD" && !flippedSettings_.empty()) {
+            keepFlippedParity();
+        }
         app_.LastCommand.clear();
         retry_.setEnabled(false);
         ++app_.ScriptStep;
@@ -80,11 +86,23 @@ void Engine::MatchAnswer() {
             app_.LastCommand.clear();
             app_.ScriptStep = kNoRun;
             retry_.setEnabled(false);
+            forgetRun();
         }
     } else {
         note("answer refused: " + line);
         app_.ElapsedTicks = 0;
     }
+}
+
+// Heard only at the flipped parity: that parity is the instrument's, so the way back keeps it,
+// with the lower-case letter the settings page shows.
+void Engine::keepFlippedParity() {
+    std::string s = flippedSettings_;
+    char& p = s[s.size() - 5];
+    p = static_cast<char>(std::tolower(static_cast<unsigned char>(p)));
+    note("answered at the flipped parity: the way back keeps " + s);
+    app_.PortSettings = s;
+    flippedSettings_.clear();
 }
 
 bool Engine::CheckErrorAnswer() {

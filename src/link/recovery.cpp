@@ -34,6 +34,7 @@ void Engine::Retry_Timer() {
     app_.StepResult = false;
     app_.ScriptStep = kNoRun;
     app_.ElapsedTicks = 0;
+    forgetRun();
 }
 
 void Engine::RS_Retry_Timer() {
@@ -77,12 +78,16 @@ void Engine::abortRun(const std::string& why) {
     app_.ScriptStep = kNoRun;
     app_.LineBuffer.clear();
     port_.clearOutBuffer();
+    forgetRun();
 }
 
 void Engine::restartArea(const std::string& request) {
     note("restart granted: " + request);
     app_.LineBuffer.clear();
-    while (port_.portOpen() && port_.outBufferCount() > 0) pump_.processNextEvent();
+    // A peer that holds the line stopped keeps the queue full: the run's own give-up (or an
+    // abort) must still end the drain, and then the run's end decides.
+    while (running() && port_.portOpen() && port_.outBufferCount() > 0) pump_.processNextEvent();
+    if (!running()) return;
     port_.clearOutBuffer();
     if (!port_.output(app_.Terminator + request + app_.Terminator)) {
         FailRun("could not echo the restart: " + port_.errorText());
@@ -102,6 +107,8 @@ void Engine::dsrBranch() {
     // The instrument restarting is the expected end of "REBOOT" only.
     const bool atReboot = wasRunning && current().Command == "REBOOT";
     note("DSR raised");
+    // With the port closed no resend or give-up may act: the recovery decides the result.
+    retry_.setEnabled(false);
     port_.setPortOpen(false);
     rsRetry_.setEnabled(true);
     app_.WaitTicks = 1;
@@ -111,6 +118,7 @@ void Engine::dsrBranch() {
     app_.LineBuffer.clear();
     app_.ScriptStep = kNoRun;
     retry_.setEnabled(false);
+    forgetRun();
     if (wasRunning && !atReboot) {
         note("instrument restarted before it answered");
         app_.StepResult = false;

@@ -49,6 +49,7 @@ bool Engine::sendCommand(const ScriptEntry& e, bool first) {
     if (c == "MAINTENANCE:DOWNLOAD") {
         if (first) {
             arm(1, 25);
+            flippedSettings_.clear();
             app_.SpeedSwitchPending = 1;
             app_.PortSettings = port_.settings();
             app_.PortHandshaking = port_.handshaking();
@@ -113,10 +114,12 @@ bool Engine::sendBytes(const std::vector<uint8_t>& bytes) {
     return false;
 }
 
-// The resend goes out at the user's settings with the parity flipped between even and odd,
-// in case the instrument's parity is the other one; the send event switches speed again.
+// The resend goes out at the user's settings with the parity flipped between even and odd, in
+// case the instrument's parity is the other one; the send event switches speed again. The
+// user's own settings stay in PortSettings for the way back, unless the instrument answers at
+// the flipped parity (see MatchAnswer).
 bool Engine::reopenForResend() {
-    std::string& s = app_.PortSettings;
+    std::string s = app_.PortSettings;
     if (s.size() >= 5) {
         char& p = s[s.size() - 5];
         if (p == 'E' || p == 'e') {
@@ -125,6 +128,7 @@ bool Engine::reopenForResend() {
             p = 'E';
         }
     }
+    flippedSettings_ = s;
     note("resend at " + s);
     port_.setPortOpen(false);
     app_.SpeedSwitchPending = 1;
@@ -152,13 +156,17 @@ void Engine::BuildRevisionCommand() {
 
 void Engine::sendBranch() {
     if (port_.commEvent() != kCommEvSend || app_.SpeedSwitchPending != 1) return;
+    if (!running()) {  // the run that asked for the switch has ended
+        app_.SpeedSwitchPending = 0;
+        return;
+    }
     note(std::string("switch to ") + kDownloadSettings);
     port_.setPortOpen(false);
     bool ok = port_.setSettings(kDownloadSettings);
     ok = port_.setHandshaking(kDownloadHandshaking) && ok;
     ok = port_.setPortOpen(true) && ok;
     app_.SpeedSwitchPending = 0;
-    if (!ok && running()) FailRun("could not switch speed: " + port_.errorText());
+    if (!ok) FailRun("could not switch speed: " + port_.errorText());
 }
 
 }  // namespace zx917

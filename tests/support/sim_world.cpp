@@ -36,7 +36,9 @@ bool SimSerialPort::setPortOpen(bool open) {
 }
 
 bool SimSerialPort::output(std::span<const uint8_t> bytes) {
-    if (!open_ || failWrites || vanished_) {
+    const bool refused = !failWritesOf.empty() &&
+                         std::string(bytes.begin(), bytes.end()).starts_with(failWritesOf);
+    if (!open_ || failWrites || refused || vanished_) {
         error_ = "Input/output error";
         return false;
     }
@@ -49,7 +51,7 @@ bool SimSerialPort::output(std::span<const uint8_t> bytes) {
     const std::string settings = settings_;
     const Bytes data(bytes.begin(), bytes.end());
     s_.at((endUs + 999) / 1000, [this, gen, settings, data] {
-        if (gen != outGen_) return;  // discarded before it left
+        if (gen != outGen_ || lineHeld) return;  // discarded, or held, before it left
         outPending_ -= static_cast<int32_t>(data.size());
         if (instrument_ != nullptr) {
             const auto ours = ParseLineSettings(settings);
@@ -58,6 +60,7 @@ bool SimSerialPort::output(std::span<const uint8_t> bytes) {
         }
         if (open_ && outPending_ == 0) raise(kCommEvSend);
     });
+    if (onSent) onSent(sent.back());
     return true;
 }
 

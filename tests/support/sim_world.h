@@ -150,6 +150,10 @@ public:
     std::vector<std::string> settingsHistory;  // every accepted settings change while open
     bool present = true;
     bool failWrites = false;
+    std::string failWritesOf;  // refuse the writes whose text starts with this
+    // The peer holds the line stopped (XOFF or CTS low): bytes not yet gone stay queued.
+    bool lineHeld = false;
+    std::function<void(const Sent&)> onSent;  // after every accepted write
     int opens = 0;
 
 private:
