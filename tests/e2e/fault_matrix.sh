@@ -73,6 +73,9 @@ matrix=(
     "garbled record answer|--fault garble:DL:9|failed"
     "garbled REVC|--fault garble:REVC|failed"
     "erase refused|--fault refuse:EP:2|failed"
+    "parity kept across a silent instrument|--settings 9600,e,8,1 --fault silent:MAINTENANCE:DOWNLOAD|noport|--settings 9600,e,8,1"
+    "silent at 19200,o,7,2 with XON/XOFF|--settings 19200,o,7,2 --fault silent:MAINTENANCE:DOWNLOAD|noport|--settings 19200,o,7,2 --xon"
+    "a second identification after a failed one|--settings 9600,e,8,1 --fault silent:MAINTENANCE:DOWNLOAD:1:2|ok|--settings 9600,e,8,1 --tries 2"
 )
 
 for row in "${matrix[@]}"; do
@@ -119,9 +122,14 @@ for row in "${matrix[@]}"; do
     # Never success that the instrument did not confirm, never a failure that it did.
     { [ "$rc" = 0 ] && [ "$confirmed" = true ]; } || { [ "$rc" != 0 ] && [ "$confirmed" != true ]; } ||
         problems+=("exit $rc but the instrument's confirmation is '$confirmed'")
-    last=$(grep "port closed at" "$work/trace.txt" | tail -1)
-    [[ "$last" == *"port closed at $user_settings handshaking $user_hs" ]] ||
-        problems+=("port not put back: '$last'")
+    # Every close, also after a failed identification that is tried again, is on the user's
+    # settings, exactly as the user wrote them.
+    closes=$(grep -c "port closed at" "$work/trace.txt")
+    [ "$closes" -ge 1 ] || problems+=("the port was never closed")
+    while IFS= read -r line; do
+        [[ "$line" == *"port closed at $user_settings handshaking $user_hs" ]] ||
+            problems+=("port not put back: '$line'")
+    done < <(grep "port closed at" "$work/trace.txt")
     pgrep -f "$work/com1" >/dev/null && problems+=("a process was left behind")
     if [ ${#problems[@]} -eq 0 ]; then
         echo "ok      $name"

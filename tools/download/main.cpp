@@ -15,8 +15,10 @@ Commands:
                         the length and the records and bytes each section sends.
                         Exit status 0 when every file passed, 1 otherwise.
   identify --port DEV [--settings 9600,n,8,1] [--terminator crlf|cr|lf] [--xon]
-                        [--trace FILE]
-                        identify the instrument and read its current firmware revision.
+                        [--trace FILE] [--tries N]
+                        identify the instrument and read its current firmware revision;
+                        --tries N tries the identification up to N times, closing and
+                        reopening the port in between (the instrument switched on late).
   download --port DEV --file FILE [same options] [--yes]
                         identify, check the file and send it to the instrument.
                         Exit status 0 only when the instrument confirmed the new revision.

@@ -13,7 +13,6 @@
 #include "app/texts.h"
 #include "download/cli_view.h"
 #include "download/commands.h"
-#include "download/trace_writer.h"
 #include "firmware/download_file.h"
 #include "firmware/operations.h"
 #include "firmware/revision.h"
@@ -22,6 +21,7 @@
 #include "link/line_settings.h"
 #include "link/qt/qt_platform.h"
 #include "link/qt/qt_serial_port.h"
+#include "link/qt/trace_writer.h"
 #include "terminal_dialogs.h"
 
 namespace zx917 {
@@ -43,6 +43,7 @@ struct Options {
     std::string port, settings = kDefaultSettings, terminator = kDefaultTerminator, trace, file;
     bool xon = false;
     bool yes = false;
+    int tries = 1;  // identifications, as an engineer pressing Next again after a failure
 };
 
 bool parse(const std::vector<std::string>& args, bool download, Options& o) {
@@ -65,6 +66,10 @@ bool parse(const std::vector<std::string>& args, bool download, Options& o) {
             o.xon = true;
         else if (a == "--yes" && download)
             o.yes = true;
+        else if (a == "--tries" && hasValue) {
+            o.tries = std::atoi(args[++i].c_str());
+            if (o.tries < 1 || o.tries > 100) return false;
+        }
         else
             return false;
     }
@@ -84,13 +89,7 @@ public:
         InitDefaults(app, ProgramFolder());
         if (!o.trace.empty()) {
             trace = std::make_unique<TraceWriter>(o.trace);
-            port.onTraffic = [this](bool sent, std::span<const uint8_t> bytes) {
-                trace->traffic(
-                    sent, bytes,
-                    port.settings() +
-                        (port.handshaking() ? " hs" + std::to_string(port.handshaking()) : ""));
-            };
-            engine.setTrace([this](const std::string& e) { trace->event(e); });
+            AttachTrace(*trace, port, engine);
         }
     }
     ~Session() {
@@ -106,17 +105,35 @@ public:
             std::cerr << "(" << port.errorText() << ")" << std::endl;
             return false;
         }
-        port.setSettings(opt_.settings);
+        const bool applied =
+            port.setSettings(opt_.settings) && port.setHandshaking(opt_.xon ? 1 : 0);
         app.Terminator = opt_.terminator;
-        port.setHandshaking(opt_.xon ? 1 : 0);
-        if (trace) trace->event("port " + opt_.port + " open at " + port.settings());
+        if (trace) {
+            trace->event("port " + opt_.port + " open at " + port.settings() +
+                         (applied ? "" : " (settings refused: " + port.errorText() + ")"));
+        }
         return true;
     }
 
+    // Identification as the wizard repeats it: a failure closes the port (page 0), the next
+    // try opens it again with the engineer's settings (page 1).
+    bool identify() {
+        for (int n = 1;; ++n) {
+            if (!openPort()) return false;
+            if (ops.ReadCurrentRevision()) return true;
+            if (n >= opt_.tries) return false;
+            close();
+            std::cerr << "identification failed; trying again (" << n + 1 << " of " << opt_.tries
+                      << ")" << std::endl;
+        }
+    }
+
+    // The trace shows the settings the operations left on the port, then the port is closed
+    // and given the engineer's settings for whatever opens it next.
     void putPortBack() {
+        close();
         port.setSettings(opt_.settings);
         port.setHandshaking(opt_.xon ? 1 : 0);
-        close();
     }
 
     void close() {
@@ -173,8 +190,7 @@ int RunIdentifyCommand(const std::vector<std::string>& args) {
     if (!parse(args, false, o)) return usage("identify");
     qtCore();
     Session s(o);
-    if (!s.openPort()) return 1;
-    const bool ok = s.ops.ReadCurrentRevision();
+    const bool ok = s.identify();
     if (ok) printRevision(s);
     s.putPortBack();
     return ok ? 0 : 1;
@@ -186,8 +202,7 @@ int RunDownloadCommand(const std::vector<std::string>& args) {
     qtCore();
     Session s(o);
     AppState& app = s.app;
-    if (!s.openPort()) return 1;
-    if (!s.ops.ReadCurrentRevision()) {
+    if (!s.identify()) {
         s.putPortBack();
         return 1;
     }

@@ -112,10 +112,10 @@ bool QtSerialPort::setPortOpen(bool open) {
     }
     dsr_ = false;
     int bits = 0;
-    if (::ioctl(port_.handle(), TIOCMGET, &bits) == 0) {
+    if (readModemLines(port_.handle(), bits)) {
         dsr_ = (bits & TIOCM_DSR) != 0;
         dsrPoll_.start();
-    }  // ENOTTY: no modem lines (a pseudo-terminal), so no DSR events
+    }  // no modem lines (a pseudo-terminal), so no DSR events
     return true;
 }
 
@@ -171,9 +171,13 @@ void QtSerialPort::checkDrained() {
     raise(kCommEvSend);
 }
 
+bool QtSerialPort::ReadModemLines(int fd, int& bits) {
+    return ::ioctl(fd, TIOCMGET, &bits) == 0;  // ENOTTY on a pseudo-terminal
+}
+
 void QtSerialPort::pollModemLines() {
     int bits = 0;
-    if (!port_.isOpen() || ::ioctl(port_.handle(), TIOCMGET, &bits) != 0) {
+    if (!port_.isOpen() || !readModemLines(port_.handle(), bits)) {
         dsrPoll_.stop();
         return;
     }

@@ -42,6 +42,12 @@ public:
     // Every byte written and read, for a trace; settings are those of the moment.
     std::function<void(bool sent, std::span<const uint8_t> bytes)> onTraffic;
 
+    // Reads the modem lines (TIOCM_* bits) of the open device; false when it has none, as a
+    // pseudo-terminal. A test replaces it to raise and drop DSR through the real poll.
+    using ModemLineReader = std::function<bool(int fd, int& bits)>;
+    static bool ReadModemLines(int fd, int& bits);
+    ModemLineReader readModemLines = ReadModemLines;
+
 private:
     void raise(int16_t code);
     void queue(int16_t code);

@@ -1,6 +1,8 @@
 #include "link/qt/termios_settings.h"
 
 #include <sys/ioctl.h>
+#include <sys/stat.h>
+#include <sys/sysmacros.h>
 
 #include <cerrno>
 #include <cstring>
@@ -97,8 +99,20 @@ std::string ApplyLineSettings(int fd, const LineSettings& s, int16_t handshaking
     tio.c_iflag &= ~static_cast<tcflag_t>(IXON | IXOFF | IXANY | INPCK | ISTRIP);
     if (handshaking == 1 || handshaking == 3) tio.c_iflag |= IXON | IXOFF;
     if (handshaking == 2 || handshaking == 3) tio.c_cflag |= CRTSCTS;
-    if (::tcsetattr(fd, TCSANOW, &tio) != 0) return std::strerror(errno);
+    if (::tcsetattr(fd, TCSANOW, &tio) != 0) {
+        // glibc reports EINVAL when the kernel dropped the parity or size bits; a pseudo-
+        // terminal always does (it has no line to carry them), a real port means it.
+        if (errno == EINVAL && IsPseudoTerminal(fd)) return {};
+        return std::strerror(errno);
+    }
     return {};
+}
+
+bool IsPseudoTerminal(int fd) {
+    struct stat st {};
+    if (::fstat(fd, &st) != 0 || !S_ISCHR(st.st_mode)) return false;
+    const unsigned m = major(st.st_rdev);
+    return m >= 136 && m <= 143;  // UNIX98 pty slaves
 }
 
 int32_t KernelOutQueue(int fd) {

@@ -17,6 +17,9 @@ speed_t SpeedConstant(int baud);
 // Returns an empty text on success, else the system's reason.
 std::string ApplyLineSettings(int fd, const LineSettings& settings, int16_t handshaking);
 
+// True for the slave side of a pseudo-terminal (a simulator's line, not a real port).
+bool IsPseudoTerminal(int fd);
+
 // Bytes the kernel still holds for sending; 0 when it cannot tell.
 int32_t KernelOutQueue(int fd);
 

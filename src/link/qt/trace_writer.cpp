@@ -1,6 +1,9 @@
-#include "download/trace_writer.h"
+#include "link/qt/trace_writer.h"
 
 #include <cstdio>
+
+#include "link/engine.h"
+#include "link/qt/qt_serial_port.h"
 
 namespace zx917 {
 
@@ -73,6 +76,14 @@ void TraceWriter::flush() {
     if (rx_.empty()) return;
     line("RX", rxSettings_, printable(rx_), rxStamp_);
     rx_.clear();
+}
+
+void AttachTrace(TraceWriter& trace, QtSerialPort& port, Engine& engine) {
+    port.onTraffic = [&trace, &port](bool sent, std::span<const uint8_t> bytes) {
+        const int16_t hs = port.handshaking();
+        trace.traffic(sent, bytes, port.settings() + (hs ? " hs" + std::to_string(hs) : ""));
+    };
+    engine.setTrace([&trace](const std::string& e) { trace.event(e); });
 }
 
 }  // namespace zx917

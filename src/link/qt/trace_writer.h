@@ -9,6 +9,9 @@
 
 namespace zx917 {
 
+class Engine;
+class QtSerialPort;
+
 class TraceWriter {
 public:
     explicit TraceWriter(const std::string& path);
@@ -28,5 +31,9 @@ private:
     std::string rx_;  // received bytes until their line ends
     std::string rxSettings_;
 };
+
+// Writes every byte of the port, with the settings of the moment, and every event of the
+// engine to the trace.
+void AttachTrace(TraceWriter& trace, QtSerialPort& port, Engine& engine);
 
 }  // namespace zx917
