@@ -2,13 +2,12 @@
 
 #include <sys/ioctl.h>
 
-#include <QSerialPortInfo>
-#include <algorithm>
 #include <cerrno>
 #include <cstdlib>
 #include <cstring>
 
 #include "link/line_settings.h"
+#include "link/qt/port_list.h"
 #include "link/qt/termios_settings.h"
 
 namespace zx917 {
@@ -38,14 +37,7 @@ QtSerialPort::~QtSerialPort() {
 }
 
 std::string QtSerialPort::DevicePath(int16_t port) {
-    const std::string var = "ZX917_COM" + std::to_string(port);
-    if (const char* env = std::getenv(var.c_str()); env != nullptr && *env != '\0') return env;
-    auto ports = QSerialPortInfo::availablePorts();
-    std::sort(ports.begin(), ports.end(), [](const QSerialPortInfo& a, const QSerialPortInfo& b) {
-        return a.portName() < b.portName();
-    });
-    if (port < 1 || port > ports.size()) return {};
-    return ports[port - 1].systemLocation().toStdString();
+    return ComDevice(port).path;
 }
 
 bool QtSerialPort::setCommPort(int16_t port) {

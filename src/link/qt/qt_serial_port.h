@@ -18,7 +18,7 @@ public:
     explicit QtSerialPort(QObject* parent = nullptr);
     ~QtSerialPort() override;
 
-    // The device of port n: $ZX917_COM<n>, else the n-th port the system lists, by name.
+    // The device of port n: $ZX917_COM<n>, else the n-th port the system lists (port_list.h).
     static std::string DevicePath(int16_t port);
 
     bool setCommPort(int16_t port) override;

@@ -1,0 +1,27 @@
+// Which device "Com1", "Com2", ... stand for: $ZX917_COM<n> when set, else the system's serial
+// ports with USB and ACM adapters (the cables engineers plug in) first, each group by name.
+#pragma once
+
+#include <cstdint>
+#include <string>
+#include <vector>
+
+namespace zx917 {
+
+struct SystemPort {
+    std::string name;         // ttyUSB0
+    std::string path;         // /dev/ttyUSB0
+    std::string description;  // as the system reports it, e.g. "FT232R USB UART"
+    bool adapter = false;     // a USB or ACM adapter
+};
+
+// The ports in the order Com1, Com2, ... take them.
+std::vector<SystemPort> OrderPorts(std::vector<SystemPort> ports);
+
+// The ports the system lists now, ordered.
+std::vector<SystemPort> SystemPorts();
+
+// The device of port n and its description; an empty path when there is none.
+SystemPort ComDevice(int16_t port);
+
+}  // namespace zx917

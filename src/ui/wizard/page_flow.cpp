@@ -1,0 +1,129 @@
+// The page flow: the load step, the forward, back and cancel buttons, and the unload step.
+#include <QCloseEvent>
+#include <QGuiApplication>
+#include <QScreen>
+#include <QShortcut>
+
+#include "app/identity.h"
+#include "firmware/revision.h"
+#include "ui/common/qt_text.h"
+#include "ui/common/twips.h"
+#include "ui/wizard/frm_main.h"
+
+namespace zx917::ui {
+
+namespace {
+constexpr int kClientWidth = 8388;
+constexpr int kClientHeight = 4416;
+constexpr int32_t kF1Context = 1;
+}  // namespace
+
+FrmMain::FrmMain(const WizardParts& parts)
+    : QWidget(nullptr, Qt::Dialog | Qt::CustomizeWindowHint | Qt::WindowTitleHint |
+                           Qt::WindowCloseButtonHint | Qt::MSWindowsFixedSizeDialogHint),
+      p_(parts),
+      ops_(FirmwareParts{parts.app, parts.texts, parts.dialogs, parts.file, parts.engine,
+                         parts.port, parts.timer1, *this}) {
+    setObjectName("FrmMain");
+    setWindowTitle(QString::fromLatin1(kWindowTitle));
+    setFixedSize(px(kClientWidth), px(kClientHeight));
+    QFont design("Arial");
+    design.setPointSizeF(9.6);
+    design.setBold(true);
+    setFont(design);
+    buildPages();
+    auto* f1 = new QShortcut(QKeySequence(Qt::Key_F1), this);
+    f1->setContext(Qt::WindowShortcut);
+    connect(f1, &QShortcut::activated, this, [this] {
+        const int page = currentPage();
+        help_.show(helpFile_, page >= 0 ? Picture4[page]->property("helpContext").toInt()
+                                        : kF1Context);
+    });
+}
+
+FrmMain::~FrmMain() = default;
+
+void FrmMain::Form_Load() {
+    helpFile_ = JoinPath(p_.programFolder, std::string(kExeBaseName) + kHelpFileSuffix);
+    for (QWidget* page : Picture4) page->setProperty("helpContext", kF1Context);
+    p_.app.ScriptStep = kNoRun;
+    InitMessages(p_.texts);
+    InitCommandScript(p_.script);
+    // A missing or unreadable clip leaves the player empty.
+    Animation1->open(JoinPath(p_.programFolder, kClipFileName));
+    REV_Font();
+    SetTabOrder();
+    GoToPage(0);
+    if (windowState() == Qt::WindowNoState) {
+        if (const QScreen* screen = QGuiApplication::primaryScreen()) {
+            const QRect s = screen->geometry();
+            move(s.x() + (s.width() - width()) / 2, s.y() + (s.height() - height()) / 2);
+        }
+    }
+}
+
+void FrmMain::CmdNext_Click(int16_t index) {
+    AppState& app = p_.app;
+    switch (index) {
+        case 0:
+            if (settings->ProtSettings()) GoToPage(1);
+            break;
+        case 1:
+            if (!settings->ProtSettingsApply()) break;
+            if (!ops_.ReadCurrentRevision()) {
+                GoToPage(0);
+                break;
+            }
+            app.SelectedFileName.clear();
+            app.FilePath.clear();
+            app.SelectedRevision = "       ";
+            CmdNext[2]->setEnabled(false);
+            SetCaption(NewFirmInfo[2], " ");
+            SetCaption(NewFirmFile[2], " ");
+            GoToPage(2);
+            break;
+        case 2:
+            if (CurrentIsNewerOrEqual(app.CurrentRevision, app.SelectedRevision) &&
+                !p_.dialogs.question(p_.texts.MessageTable[kMsgCurrentIsNewer])) {
+                break;
+            }
+            GoToPage(3);
+            ops_.PrepareDownload();
+            break;
+        case 3:
+            if (!p_.dialogs.question(p_.texts.QuestionTable[kQstStart])) break;
+            GoToPage(4);
+            ops_.StartDownload();
+            break;
+        case 5:
+            p_.dialogs.information(p_.texts.QuestionTable[kQstExit]);
+            close();
+            break;
+        default:
+            break;
+    }
+}
+
+void FrmMain::CmdBack_Click(int16_t index) {
+    if (index == 3) GoToPage(2);
+}
+
+void FrmMain::CmdExit_Click(int16_t index) {
+    if (index < 0 || index > 3) return;
+    if (p_.dialogs.question(p_.texts.QuestionTable[kQstQuit])) close();
+}
+
+void FrmMain::closeEvent(QCloseEvent* event) {
+    event->accept();
+    Form_Unload();
+}
+
+// The one way the program ends, whatever closed the window and wherever the program waits:
+// the port is closed and the process ends without unwinding the waits.
+void FrmMain::Form_Unload() {
+    if (p_.port.portOpen()) p_.port.setPortOpen(false);
+    help_.close();
+    if (p_.endProcess) p_.endProcess();
+}
+
+}  // namespace zx917::ui
