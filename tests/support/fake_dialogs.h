@@ -2,6 +2,7 @@
 #pragma once
 
 #include <deque>
+#include <ostream>
 #include <string>
 #include <vector>
 
@@ -15,6 +16,9 @@ public:
         std::string kind;  // "critical", "question", "information", "beep"
         std::string text;
         bool operator==(const Shown&) const = default;
+        friend void PrintTo(const Shown& s, std::ostream* os) {
+            *os << s.kind << " \"" << s.text << "\"";
+        }
     };
 
     void critical(const std::string& text) override { shown.push_back({"critical", text}); }

@@ -25,7 +25,7 @@ bool SimSerialPort::setPortOpen(bool open) {
         return true;
     }
     if (open_) return true;
-    if (!present || vanished_) {
+    if (!present || vanished_ || absent.count(port_) > 0) {
         error_ = "No such file or directory";
         return false;
     }

@@ -8,6 +8,7 @@
 #include <map>
 #include <memory>
 #include <optional>
+#include <set>
 #include <stdexcept>
 #include <string>
 #include <vector>
@@ -149,6 +150,7 @@ public:
     std::vector<Sent> sent;
     std::vector<std::string> settingsHistory;  // every accepted settings change while open
     bool present = true;
+    std::set<int16_t> absent;  // port numbers that cannot be opened (missing or held elsewhere)
     bool failWrites = false;
     std::string failWritesOf;  // refuse the writes whose text starts with this
     // The peer holds the line stopped (XOFF or CTS low): bytes not yet gone stay queued.

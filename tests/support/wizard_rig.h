@@ -1,0 +1,91 @@
+// The main window on the simulated world: the engine in simulated time against the in-process
+// instrument, the message boxes answered by the test, the file chooser stood in for.
+#pragma once
+
+#include <QPushButton>
+#include <QTest>
+#include <memory>
+#include <string>
+
+#include "app/texts.h"
+#include "common/download_files.h"
+#include "link/port_defaults.h"
+#include "support/fake_dialogs.h"
+#include "support/sim_world.h"
+#include "ui/wizard/frm_main.h"
+
+namespace zx917::test {
+
+// A download file of our records with this revision in its header.
+inline gen::Bytes DownloadFile(const std::string& revision, int records = 3) {
+    gen::FileLayout layout;
+    layout.header = revision + "\r\nMDSP:" + revision + "\r\nCDMA:" + revision + "\r\nAMPS:" +
+                    revision + "\r\nMPU:" + revision + "\r\n";
+    layout.sections = gen::StandardSections(records);
+    return gen::Build(layout);
+}
+
+struct WizardRig {
+    explicit WizardRig(InstrumentOptions options = {}, bool withInstrument = true,
+                       std::function<QStringList()> families = {})
+        : world(std::move(options), withInstrument) {
+        world.port.setPortOpen(false);
+        window = std::make_unique<ui::FrmMain>(ui::WizardParts{
+            world.app, texts, world.script, world.port, world.timer1, world.engine, world.file,
+            dialogs, folder.path(), std::move(families),
+            [](int16_t n) { return "/dev/ttyUSB" + std::to_string(n - 1) + " - test adapter"; },
+            [this] {
+                ++ended;
+                portOpenAtEnd = world.port.portOpen();
+            },
+            [this] {
+                ++chooserShown;
+                if (onChooser) onChooser();
+            }});
+        window->Form_Load();
+        InitDefaults(world.app, world.port, folder.path());
+        window->show();
+    }
+
+    ui::FrmMain& w() { return *window; }
+    int page() const { return window->currentPage(); }
+
+    // A click as the engineer's: a disabled button takes none.
+    void click(QPushButton* button) { QTest::mouseClick(button, Qt::LeftButton); }
+
+    // Page 0 to page 2 against the instrument; false when page 2 was not reached.
+    bool toPage2() {
+        click(window->CmdNext[0]);
+        if (page() != 1) return false;
+        click(window->CmdNext[1]);
+        return page() == 2;
+    }
+
+    // The chooser's stand-in opens this file as "&Open" would after a successful check.
+    void choose(const gen::Bytes& content, const std::string& revision,
+                const std::string& name = "NEW.HEX") {
+        const std::string path = folder.write(name, content);
+        onChooser = [this, path, name, revision] {
+            world.app.FilePath = path;
+            world.app.SelectedFileName = name;
+            world.app.HexFolder = folder.path();
+            world.app.SelectedRevision = revision;
+        };
+        click(window->CmdFirmSelect);
+    }
+
+    // Texts shown, in order, with their kinds.
+    std::vector<FakeDialogs::Shown> shown() const { return dialogs.shown; }
+
+    gen::TempDir folder;  // the program folder
+    SimWorld world;
+    TextTables texts;
+    FakeDialogs dialogs;
+    std::unique_ptr<ui::FrmMain> window;
+    std::function<void()> onChooser;
+    int chooserShown = 0;
+    int ended = 0;
+    bool portOpenAtEnd = false;
+};
+
+}  // namespace zx917::test
