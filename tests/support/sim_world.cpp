@@ -11,7 +11,7 @@ int64_t SimSerialPort::charTimeUs(const std::string& settings) const {
 }
 
 bool SimSerialPort::setSettings(const std::string& settings) {
-    if (!ParseLineSettings(settings)) return false;
+    if (!anySettingsText && !ParseLineSettings(settings)) return false;
     settings_ = settings;
     if (open_) settingsHistory.push_back(settings);
     return true;

@@ -151,6 +151,7 @@ public:
     std::vector<std::string> settingsHistory;  // every accepted settings change while open
     bool present = true;
     std::set<int16_t> absent;  // port numbers that cannot be opened (missing or held elsewhere)
+    bool anySettingsText = false;  // keeps any settings text, as a port that never checks
     bool failWrites = false;
     std::string failWritesOf;  // refuse the writes whose text starts with this
     // The peer holds the line stopped (XOFF or CTS low): bytes not yet gone stay queued.

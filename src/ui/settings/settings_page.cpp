@@ -103,6 +103,7 @@ bool SettingsPage::ProtSettings() {
     cboPort->clear();
     const int16_t previous = port.commPort();
     int16_t chosen = 0;
+    int selected = -1;  // the list itself selects its first item; the rule here decides
     int count = 0;
     for (int16_t n = 1; n <= kProbedPorts; ++n) {
         port.setCommPort(n);
@@ -111,15 +112,16 @@ bool SettingsPage::ProtSettings() {
             cboPort->addItem("Com" + QString::number(n));
             const std::string where = p_.describePort ? p_.describePort(n) : std::string();
             cboPort->setItemData(count, FromFileName(where), Qt::ToolTipRole);
-            if (cboPort->currentIndex() < 0 || n == previous) {
-                cboPort->setCurrentIndex(count);
+            if (selected < 0 || n == previous) {
+                selected = count;
                 chosen = n;
             }
             port.setPortOpen(false);
             ++count;
         }
     }
-    if (cboPort->currentIndex() < 0) {
+    cboPort->setCurrentIndex(selected);
+    if (selected < 0) {
         p_.dialogs.beep();
         p_.dialogs.critical(p_.texts.MessageTable[kMsgPortUnavailable]);
         return false;

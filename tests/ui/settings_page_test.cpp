@@ -1,0 +1,184 @@
+// The settings page: the probe of Com1 and Com2, the lists filled from the port's settings,
+// Preset, and the choice applied to the port.
+#include <gtest/gtest.h>
+
+#include "support/wizard_rig.h"
+
+namespace zx917 {
+namespace {
+
+using test::WizardRig;
+using Shown = test::FakeDialogs::Shown;
+
+QStringList items(QComboBox* list) {
+    QStringList out;
+    for (int i = 0; i < list->count(); ++i) out << list->itemText(i);
+    return out;
+}
+
+TEST(Settings_Probe, ListsThePresentPortsAndSelects) {
+    struct Case {
+        const char* name;
+        std::set<int16_t> absent;
+        int16_t previous;
+        QStringList listed;
+        int selected;
+        int16_t portAfter;
+        bool ok;
+    };
+    const Case cases[] = {
+        {"only port 2", {1}, 1, {"Com2"}, 0, 2, true},
+        {"both, previous 2", {}, 2, {"Com1", "Com2"}, 1, 2, true},
+        {"both, previous 1", {}, 1, {"Com1", "Com2"}, 0, 1, true},
+        {"only port 1, previous 2", {2}, 2, {"Com1"}, 0, 1, true},
+        {"none", {1, 2}, 1, {}, -1, 2, false},
+    };
+    for (const Case& c : cases) {
+        SCOPED_TRACE(c.name);
+        WizardRig r;
+        r.world.port.setCommPort(c.previous);
+        r.world.port.absent = c.absent;
+        auto& s = *r.w().settings;
+        s.cboSpeed->addItem("kept");  // the other lists are not touched on failure
+        EXPECT_EQ(s.ProtSettings(), c.ok);
+        EXPECT_EQ(items(s.cboPort), c.listed);
+        EXPECT_EQ(s.cboPort->currentIndex(), c.selected);
+        EXPECT_EQ(r.world.port.commPort(), c.portAfter);
+        EXPECT_FALSE(r.world.port.portOpen());
+        if (c.ok) {
+            EXPECT_TRUE(r.shown().empty());
+            EXPECT_EQ(items(s.cboSpeed), QStringList({"9600", "19200"}));
+            EXPECT_EQ(items(s.cboDataBits), QStringList({"7", "8"}));
+            EXPECT_EQ(items(s.cboStopBits), QStringList({"1", "2"}));
+            EXPECT_EQ(items(s.cboParity), QStringList({"Even", "Odd", "None"}));
+            EXPECT_EQ(items(s.cboXon), QStringList({"None", "Xon/Xoff"}));
+            EXPECT_EQ(items(s.cboEoc), QStringList({"LF", "CR", "CR+LF"}));
+            // Each item says which device it stands for.
+            const QString n = s.cboPort->currentText().mid(3);
+            EXPECT_EQ(s.cboPort->itemData(s.cboPort->currentIndex(), Qt::ToolTipRole).toString(),
+                      "/dev/ttyUSB" + QString::number(n.toInt() - 1) + " - test adapter");
+        } else {
+            EXPECT_EQ(r.shown(), (std::vector<Shown>{
+                                     {"beep", ""}, {"critical", "Communication port not available."}}));
+            EXPECT_EQ(items(s.cboSpeed), QStringList({"kept"}));
+        }
+    }
+}
+
+TEST(Settings_Show, ListsTakeThePortsSettingsApart) {
+    struct Case {
+        std::string settings;
+        std::string terminator;
+        int16_t handshaking;
+        QString speed, parity, dataBits, stopBits, eoc, xon;
+    };
+    const Case cases[] = {
+        {"19200,o,7,2", "\r", 1, "19200", "Odd", "7", "2", "CR", "Xon/Xoff"},
+        {"9600,e,8,1", "\n", 0, "9600", "Even", "8", "1", "LF", "None"},
+        {"9600,n,8,1", "\r\n", 0, "9600", "None", "8", "1", "CR+LF", "None"},
+        // An upper-case parity letter selects nothing.
+        {"9600,E,8,1", "\r\n", 0, "9600", "", "8", "1", "CR+LF", "None"},
+        // A point: the stop bits are "1.5", which the list does not hold.
+        {"4800,n,8,1.5", "\r\n", 0, "4800", "None", "8", "", "CR+LF", "None"},
+        {"115200,n,8,1", "\r\n", 0, "115200", "None", "8", "1", "CR+LF", "None"},
+        // Too short for the arithmetic: the four lists stay unselected.
+        {"1,n", "\r", 1, "", "", "", "", "CR", "Xon/Xoff"},
+        {"", "\r\n", 0, "", "", "", "", "CR+LF", "None"},
+        {"5,n,", "\r\n", 0, "", "", "", "", "CR+LF", "None"},
+    };
+    for (const Case& c : cases) {
+        SCOPED_TRACE(c.settings);
+        WizardRig r;
+        r.world.port.anySettingsText = true;
+        ASSERT_TRUE(r.world.port.setSettings(c.settings));
+        r.world.port.setHandshaking(c.handshaking);
+        r.world.app.Terminator = c.terminator;
+        auto& s = *r.w().settings;
+        ASSERT_TRUE(s.ProtSettings());
+        EXPECT_EQ(s.cboSpeed->currentText(), c.speed);
+        EXPECT_EQ(s.cboParity->currentText(), c.parity);
+        EXPECT_EQ(s.cboDataBits->currentText(), c.dataBits);
+        EXPECT_EQ(s.cboStopBits->currentText(), c.stopBits);
+        EXPECT_EQ(s.cboEoc->currentText(), c.eoc);
+        EXPECT_EQ(s.cboXon->currentText(), c.xon);
+    }
+}
+
+TEST(Settings_Apply, TheChoiceReachesThePort) {
+    struct Case {
+        const char* name;
+        std::function<void(ui::SettingsPage&)> choose;
+        std::string settings;
+        std::string terminator;
+        int16_t handshaking;
+    };
+    const Case cases[] = {
+        {"Preset after other choices",
+         [](ui::SettingsPage& s) {
+             ui::SetListText(s.cboSpeed, "19200");
+             ui::SetListText(s.cboDataBits, "7");
+             ui::SetListText(s.cboParity, "Odd");
+             ui::SetListText(s.cboStopBits, "2");
+             ui::SetListText(s.cboEoc, "LF");
+             s.cboXon->setCurrentIndex(1);
+             QTest::mouseClick(s.cmdReset, Qt::LeftButton);
+         },
+         "9600,n,8,1", "\r\n", 0},
+        {"odd parity, CR, Xon/Xoff",
+         [](ui::SettingsPage& s) {
+             ui::SetListText(s.cboParity, "Odd");
+             ui::SetListText(s.cboEoc, "CR");
+             s.cboXon->setCurrentIndex(1);
+         },
+         "9600,o,8,1", "\r", 1},
+        {"a typed rate with blanks around it",
+         [](ui::SettingsPage& s) {
+             s.cboSpeed->setEditText("  19200 ");
+             ui::SetListText(s.cboEoc, "LF");
+         },
+         "19200,n,8,1", "\n", 0},
+        {"a rate not in the list, taken as typed",
+         [](ui::SettingsPage& s) { s.cboSpeed->setEditText("57600"); }, "57600,n,8,1", "\r\n", 0},
+    };
+    for (const Case& c : cases) {
+        SCOPED_TRACE(c.name);
+        WizardRig r({}, false);
+        r.click(r.w().CmdNext[0]);
+        ASSERT_EQ(r.page(), 1);
+        c.choose(*r.w().settings);
+        ASSERT_TRUE(r.w().settings->ProtSettingsApply());
+        EXPECT_TRUE(r.world.port.portOpen());
+        EXPECT_EQ(r.world.port.settings(), c.settings);
+        EXPECT_EQ(r.world.port.handshaking(), c.handshaking);
+        EXPECT_EQ(r.world.app.Terminator, c.terminator);
+        EXPECT_TRUE(r.shown().empty());
+        // The identification's queries end with the chosen terminator.
+        r.world.engine.RunStage(kStageIdnOnly, 0);
+        ASSERT_FALSE(r.world.port.sent.empty());
+        EXPECT_EQ(r.world.port.sent.front().text(), "*IDN?" + c.terminator);
+        EXPECT_EQ(r.world.port.sent.front().settings, c.settings);
+    }
+}
+
+// While the instrument is asked for its revision, nothing on page 1 but help takes a click.
+TEST(Settings_Apply, PageLockedWhileTheInstrumentIsAsked) {
+    WizardRig r;
+    r.click(r.w().CmdNext[0]);
+    std::vector<bool> enabledDuring;
+    r.world.port.onSent = [&](const test::Sent&) {
+        auto& s = *r.w().settings;
+        for (QWidget* w : s.tabStops()) enabledDuring.push_back(w->isEnabled());
+        enabledDuring.push_back(r.w().CmdNext[1]->isEnabled());
+        enabledDuring.push_back(r.w().CmdExit[1]->isEnabled());
+        EXPECT_TRUE(r.w().CmdHelp[1]->isEnabled());
+    };
+    r.click(r.w().CmdNext[1]);
+    ASSERT_EQ(r.page(), 2);
+    ASSERT_FALSE(enabledDuring.empty());
+    EXPECT_EQ(std::count(enabledDuring.begin(), enabledDuring.end(), true), 0);
+    // Enabled again for the next visit (the page itself is now hidden and disabled).
+    for (QWidget* w : r.w().settings->tabStops()) EXPECT_TRUE(w->isEnabledTo(r.w().Picture4[1]));
+}
+
+}  // namespace
+}  // namespace zx917
