@@ -4,6 +4,7 @@
 #include <QGuiApplication>
 #include <QKeyEvent>
 #include <QScreen>
+#include <QSet>
 #include <QShortcut>
 
 #include "app/identity.h"
@@ -202,10 +203,14 @@ void FrmNewSel::FillFileList() {
         return;
     }
     const std::string pattern = ToLatin1(RetFile->currentText());
+    QSet<QString> listed;  // names that differ only in case open one file: listed once
     for (const FolderEntry& f : *files) {
         const QString upper = f.shown.toUpper();
-        if (WildcardMatch(upper.toStdString(), pattern) && AnsiByteLengthUtf8(f.name) <= kNameLimitBytes) {
+        if (listed.contains(upper)) continue;
+        if (WildcardMatch(upper.toStdString(), pattern) &&
+            AnsiByteLengthUtf8(f.name) <= kNameLimitBytes) {
             File->addItem(upper);
+            listed.insert(upper);
         }
     }
 }
