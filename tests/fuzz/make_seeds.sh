@@ -3,7 +3,9 @@
 set -euo pipefail
 dir="$1"
 mkfile="$2"
-mkdir -p "$dir/download_file" "$dir/reception" "$dir/settings"
+clipgen="$3"
+mkdir -p "$dir/download_file" "$dir/reception" "$dir/settings" "$dir/avi"
+"$clipgen" "$dir/avi/Filemove.avi"
 "$mkfile" --bytes 600 "$dir/download_file/intel.hex" >/dev/null
 "$mkfile" --bytes 600 --srec "$dir/download_file/srec.hex" >/dev/null
 printf 'A.01.02\r\nMDSP:\r\nCDMA:\r\nAMPS:\r\nMPU:\r\nxxxxxxxxxxxxxxxxxxxxxxxxxxxxxx[EOF]\r\n' \

@@ -10,9 +10,10 @@ ensure_deps
 dir="$zx917_root/build-fuzz"
 CXX=clang++ build_project "$dir" -DZX917_FUZZ=ON -DCMAKE_CXX_COMPILER=clang++ >/dev/null
 corpus="$dir/corpus"
-bash "$zx917_root/tests/fuzz/make_seeds.sh" "$corpus" "$dir/tools/zx917-mkfile"
+bash "$zx917_root/tests/fuzz/make_seeds.sh" "$corpus" "$dir/tools/zx917-mkfile" \
+    "$dir/tools/zx917-clipgen"
 status=0
-for target in download_file reception settings; do
+for target in download_file reception settings avi; do
     echo "fuzz_$target: ${seconds}s"
     if ! "$dir/tests/fuzz/fuzz_$target" "$corpus/$target" -max_total_time="$seconds" \
         -timeout=20 -rss_limit_mb=2048 -print_final_stats=1 \
