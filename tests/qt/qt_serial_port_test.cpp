@@ -116,9 +116,3 @@ TEST(QtSerialPort_Dsr, EngineRecoveryThroughTheRealAdapter) {
 
 }  // namespace
 }  // namespace zx917
-
-int main(int argc, char** argv) {
-    QCoreApplication app(argc, argv);
-    ::testing::InitGoogleTest(&argc, argv);
-    return RUN_ALL_TESTS();
-}
