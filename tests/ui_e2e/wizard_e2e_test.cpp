@@ -1,0 +1,239 @@
+// The whole wizard by clicks and keys, with the real adapter, timers and message boxes,
+// against zx917-sim; closing it while it waits; one copy at a time.
+#include <signal.h>
+
+#include "ui_e2e/e2e_support.h"
+
+namespace zx917 {
+namespace {
+
+using test::ModalAnswerer;
+using test::ProgramFolder;
+using test::SimProcess;
+
+const std::string kPortMissing =
+    "Communication port does not exist,\npossibly because of wrong Comm Port setting\nor "
+    "RS-232C cable not connected.\nCheck Comm Port setting and cable connection.";
+
+struct E2e {
+    explicit E2e(int tickMs = 1000) {
+        ui::ProgramOptions o;
+        o.programFolder = folder.dir.path();
+        o.traceFile = folder.dir.path() + "/trace.txt";
+        o.tickMs = tickMs;
+        program = std::make_unique<ui::Program>(o);
+        program->endProcess = [this] { ++ended; };
+        program->Main();
+    }
+    ui::FrmMain& w() { return *program->window; }
+    // A click; the handler may wait for the instrument, so it runs from the event loop.
+    void click(QPushButton* b) {
+        QTimer::singleShot(0, b, [b] { QTest::mouseClick(b, Qt::LeftButton); });
+    }
+    bool waitPage(int page, int ms) {
+        return test::waitFor([&] { return w().currentPage() == page; }, ms);
+    }
+
+    ProgramFolder folder;
+    std::unique_ptr<ui::Program> program;
+    int ended = 0;
+};
+
+TEST(E2e_Wizard, IdentifiesTheSimulatorAndShowsItsRevision) {
+    gen::TempDir dir;
+    SimProcess sim(dir.path(), {"--revision", "B.03.07"});
+    ASSERT_TRUE(sim.ready());
+    ::setenv("ZX917_COM1", sim.link().c_str(), 1);
+    ModalAnswerer answer;
+    E2e e;
+    EXPECT_TRUE(e.w().isVisible());
+    EXPECT_FALSE(e.program->port.portOpen());
+    e.click(e.w().CmdNext[0]);
+    ASSERT_TRUE(e.waitPage(1, 3000));
+    EXPECT_EQ(e.w().settings->cboPort->currentText(), "Com1");
+    EXPECT_TRUE(e.w().settings->cboPort->toolTip().contains(QString::fromStdString(sim.link())));
+    e.click(e.w().CmdNext[1]);
+    ASSERT_TRUE(e.waitPage(2, 10000));
+    EXPECT_EQ(e.w().CurFirmInfo[2]->text(), "B.03.07");
+    EXPECT_TRUE(e.program->port.portOpen());
+    EXPECT_EQ(e.program->port.settings(), "38400,E,8,1");
+    EXPECT_TRUE(answer.texts.empty());
+    const std::string report = sim.stop();
+    EXPECT_NE(report.find("\"command\": \"REVD X.XX.XX\""), std::string::npos);
+}
+
+TEST(E2e_Wizard, SilentInstrumentBackOnPageZeroWithThePortClosed) {
+    test::Pty silent;  // a line nobody answers on
+    ::setenv("ZX917_COM1", silent.path().c_str(), 1);
+    ModalAnswerer answer;
+    E2e e(20);  // 20 ms ticks: the 84 s of time-outs pass in under 2 s
+    e.click(e.w().CmdNext[0]);
+    ASSERT_TRUE(e.waitPage(1, 3000));
+    e.click(e.w().CmdNext[1]);
+    EXPECT_TRUE(test::waitFor([&] { return !answer.texts.empty(); }, 10000));
+    ASSERT_TRUE(e.waitPage(0, 5000));
+    QTest::qWait(200);
+    EXPECT_EQ(answer.texts, std::vector<std::string>{kPortMissing});
+    EXPECT_FALSE(e.program->port.portOpen());
+    EXPECT_EQ(e.program->port.settings(), "9600,n,8,1");
+    EXPECT_TRUE(e.w().settings->cboPort->isEnabledTo(e.w().Picture4[1]));
+}
+
+// Page 0 to page 5 by clicks and keys: the chooser reached from page 2, the name typed, Enter to
+// check, Enter to open; the simulator holds every record byte for byte.
+TEST(E2e_Wizard, WholeDownloadByClicksAndKeys) {
+    gen::TempDir dir;
+    ModalAnswerer answer;
+    const std::string file = dir.path() + "/NEW.HEX";
+    QProcess::execute(QString::fromStdString(test::kBuildDir + "/tools/zx917-mkfile"),
+                      {"--revision", "A.02.00", "--bytes", "12000", QString::fromStdString(file)});
+    SimProcess sim(dir.path(), {"--revision", "A.01.02", "--expect", QString::fromStdString(file),
+                                "--once"});
+    ASSERT_TRUE(sim.ready());
+    ::setenv("ZX917_COM1", sim.link().c_str(), 1);
+    E2e e;
+    std::filesystem::copy_file(file, e.folder.dir.path() + "/HEX/new.hex");
+    e.click(e.w().CmdNext[0]);
+    ASSERT_TRUE(e.waitPage(1, 3000));
+    e.click(e.w().CmdNext[1]);
+    ASSERT_TRUE(e.waitPage(2, 10000));
+    answer.chooser = [](ui::FrmNewSel& c) {
+        EXPECT_EQ(c.File->count(), 1);
+        EXPECT_EQ(c.File->item(0)->text(), "NEW.HEX");
+        c.FileName->setFocus();
+        QTest::keyClicks(c.FileName, "new.hex");
+        QTest::keyClick(c.FileName, Qt::Key_Return);  // checks
+        EXPECT_EQ(c.FirmRev2->text(), "A.02.00");
+        QTest::keyClick(c.focusWidget(), Qt::Key_Return);  // "&Open" has the focus
+    };
+    e.click(e.w().CmdFirmSelect);
+    ASSERT_TRUE(test::waitFor([&] { return e.w().CmdNext[2]->isEnabled(); }, 5000));
+    EXPECT_EQ(e.w().NewFirmInfo[2]->text(), "A.02.00");
+    EXPECT_EQ(e.w().NewFirmFile[2]->text(), "NEW.HEX");
+    EXPECT_EQ(e.program->app.FilePath, e.folder.dir.path() + "/HEX/new.hex");
+    e.click(e.w().CmdNext[2]);
+    ASSERT_TRUE(e.waitPage(3, 3000));
+    EXPECT_FALSE(e.w().RemTime[2]->text().isEmpty());
+    answer.answers = {true};
+    bool clipPlayed = false;
+    QTimer watch;
+    QObject::connect(&watch, &QTimer::timeout, [&] { clipPlayed |= e.w().Animation1->playing(); });
+    watch.start(50);
+    e.click(e.w().CmdNext[3]);
+    ASSERT_TRUE(e.waitPage(5, 60000));
+    EXPECT_TRUE(clipPlayed);
+    EXPECT_FALSE(e.w().Animation1->playing());
+    EXPECT_EQ(answer.texts, std::vector<std::string>{"OK to start the download?"});
+    EXPECT_EQ(e.w().ProgressBar->maximum(), static_cast<int>(std::filesystem::file_size(file)));
+    const std::string report = sim.stop();
+    EXPECT_NE(report.find("\"verdict\": \"success\""), std::string::npos) << report;
+    e.click(e.w().CmdNext[5]);
+    ASSERT_TRUE(test::waitFor([&] { return e.ended == 1; }, 3000));
+    EXPECT_EQ(answer.texts.back(), "OK to exit the download program?");
+    EXPECT_FALSE(e.program->port.portOpen());
+}
+
+TEST(E2e_Wizard, AbortMidTransferEndsOnPageZero) {
+    gen::TempDir dir;
+    ModalAnswerer answer;
+    const std::string file = dir.path() + "/NEW.HEX";
+    QProcess::execute(QString::fromStdString(test::kBuildDir + "/tools/zx917-mkfile"),
+                      {"--revision", "A.02.00", "--bytes", "12000", QString::fromStdString(file)});
+    SimProcess sim(dir.path(), {"--expect", QString::fromStdString(file), "--fault", "abort:DL:40"});
+    ASSERT_TRUE(sim.ready());
+    ::setenv("ZX917_COM1", sim.link().c_str(), 1);
+    E2e e;
+    e.click(e.w().CmdNext[0]);
+    ASSERT_TRUE(e.waitPage(1, 3000));
+    e.click(e.w().CmdNext[1]);
+    ASSERT_TRUE(e.waitPage(2, 10000));
+    e.program->app.FilePath = file;
+    e.program->app.SelectedFileName = "NEW.HEX";
+    e.program->app.SelectedRevision = "A.02.00";
+    e.w().CmdNext[2]->setEnabled(true);
+    e.click(e.w().CmdNext[2]);
+    ASSERT_TRUE(e.waitPage(3, 3000));
+    answer.answers = {true};
+    bool transferShown = false;  // the click waits inside: watch from the event loop
+    QTimer watch;
+    QObject::connect(&watch, &QTimer::timeout, [&] { transferShown |= e.w().currentPage() == 4; });
+    watch.start(5);
+    e.click(e.w().CmdNext[3]);
+    ASSERT_TRUE(e.waitPage(0, 30000));
+    EXPECT_TRUE(transferShown);
+    QTest::qWait(100);
+    EXPECT_EQ(answer.texts,
+              (std::vector<std::string>{"OK to start the download?", "Download failed."}));
+    EXPECT_FALSE(e.program->port.portOpen());
+    EXPECT_FALSE(e.w().Animation1->playing());
+    const std::string report = sim.stop();
+    EXPECT_NE(report.find("\"verdict\": \"failure\""), std::string::npos);
+}
+
+// Closing the window while the program waits for the instrument ends the process at once.
+TEST(E2e_WizardDeathTest, ClosingWhileWaitingEndsTheProcess) {
+    GTEST_FLAG_SET(death_test_style, "threadsafe");
+    test::Pty silent;
+    ::setenv("ZX917_COM1", silent.path().c_str(), 1);
+    QElapsedTimer t;
+    t.start();
+    EXPECT_EXIT(
+        {
+            ui::ProgramOptions o;
+            test::ProgramFolder folder;
+            o.programFolder = folder.dir.path();
+            ui::Program program(o);  // the real end of the process
+            program.Main();
+            auto* w = program.window.get();
+            QTimer::singleShot(0, [w] { QTest::mouseClick(w->CmdNext[0], Qt::LeftButton); });
+            QTimer::singleShot(200, [w] { QTest::mouseClick(w->CmdNext[1], Qt::LeftButton); });
+            // By now the identification waits for an answer that never comes (84 s).
+            QTimer::singleShot(1500, [w] { w->close(); });
+            QTest::qWait(60000);
+            std::exit(3);  // not reached when closing ended the process
+        },
+        ::testing::ExitedWithCode(0), "");
+    // Start-up, 1.5 s of waiting, then at most a second to end.
+    EXPECT_LT(t.elapsed(), 6000);
+}
+
+TEST(E2e_Instance, OneCopyAtATime) {
+    gen::TempDir runtime;
+    QProcessEnvironment env = QProcessEnvironment::systemEnvironment();
+    env.insert("QT_QPA_PLATFORM", "offscreen");
+    env.insert("XDG_RUNTIME_DIR", QString::fromStdString(runtime.path()));
+    env.insert("ZX917_COM1", "/nonexistent");
+    const QString exe = QString::fromStdString(test::kProgramDir + "/ZX917A");
+    auto start = [&](QProcess& p) {
+        p.setProcessEnvironment(env);
+        p.setProgram(exe);
+        p.start();
+        return p.waitForStarted(3000);
+    };
+    QProcess first;
+    ASSERT_TRUE(start(first));
+    QTest::qWait(1000);
+    ASSERT_EQ(first.state(), QProcess::Running);
+    QProcess second;
+    QElapsedTimer t;
+    t.start();
+    ASSERT_TRUE(start(second));
+    ASSERT_TRUE(second.waitForFinished(2000));
+    EXPECT_LT(t.elapsed(), 2000);
+    EXPECT_EQ(second.exitStatus(), QProcess::NormalExit);
+    EXPECT_EQ(second.exitCode(), 0);
+    EXPECT_TRUE(second.readAll().isEmpty());
+    EXPECT_EQ(first.state(), QProcess::Running);
+    // A copy that crashed leaves nothing that blocks the next start.
+    ::kill(static_cast<pid_t>(first.processId()), SIGKILL);
+    first.waitForFinished(3000);
+    QProcess third;
+    ASSERT_TRUE(start(third));
+    QTest::qWait(1000);
+    EXPECT_EQ(third.state(), QProcess::Running);
+    third.kill();
+    third.waitForFinished(3000);
+}
+
+}  // namespace
+}  // namespace zx917
