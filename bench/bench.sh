@@ -5,7 +5,9 @@
 #      and the program's CPU time as a share of the wall time
 #  (c) the download-file check of a 100 MB file against a 100 KB file, as a ratio
 #  (d) the program's CPU share while it waits 54 s for a silent instrument
-# Usage: bench/bench.sh [--quick]   (--quick leaves out (d))
+#  (e) the wizard window's whole download at the emulated line rate, driven by clicks: its
+#      wall time / ideal stop-and-wait time, and its CPU share (offscreen without a display)
+# Usage: bench/bench.sh [--quick]   (--quick leaves out (d) and (e))
 set -euo pipefail
 zx917_root="$(cd "$(dirname "$0")/.." && pwd)"
 source "$zx917_root/tools/deps.sh"
@@ -87,4 +89,26 @@ if [ "${1:-}" != "--quick" ]; then
     sim_pid=""
     read -r wall user sys <"$work/time"
     python3 -c "print(f'    {float($user)+float($sys):.2f} s CPU in {float($wall):.1f} s: {100*(float($user)+float($sys))/float($wall):.3f} %')"
+fi
+
+if [ "${1:-}" != "--quick" ]; then
+    echo "(e) the wizard window, emulated line rate 38400 baud 8E1"
+    "$bin/zx917-mkfile" --bytes 200000 "$work/GUI.HEX" >/dev/null
+    rm -f "$work/com1" "$work/report.json"
+    "$bin/zx917-sim" --link "$work/com1" --once --line-rate --answer-delay 0 --program-delay 500 \
+        --expect "$work/GUI.HEX" --report "$work/report.json" 2>/dev/null &
+    sim_pid=$!
+    for _ in $(seq 50); do [ -e "$work/com1" ] && break; sleep 0.05; done
+    read -r wall cpu ok < <("$zx917_root/build/bench/zx917-gui-bench" "$work/com1" "$work/GUI.HEX")
+    for _ in $(seq 100); do kill -0 "$sim_pid" 2>/dev/null || break; sleep 0.05; done
+    sim_pid=""
+    [ "$ok" = 1 ] && [ "$(json "$work/report.json" "d['verdict']")" = success ] || exit 1
+    python3 - "$work/report.json" "$wall" "$cpu" <<'PY'
+import json, sys
+d = json.load(open(sys.argv[1])); t = d["transfer"]
+ideal_ms = (t["bytes_in"] + t["bytes_out"]) * 11 / 38400 * 1000 + t["delays_ms"]
+wall, cpu = float(sys.argv[2]), float(sys.argv[3])
+print(f"    transfer {t['ms']} ms, ideal {ideal_ms:.0f} ms: ratio {t['ms'] / ideal_ms:.3f}")
+print(f"    window CPU share of the download's wall time ({wall:.1f} s): {100 * cpu / wall:.2f} %")
+PY
 fi

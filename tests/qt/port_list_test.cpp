@@ -47,12 +47,18 @@ TEST(PortList_Com, VariablesNameTheDevice) {
     const SystemPort com2 = ComDevice(2);
     EXPECT_EQ(com2.path, "/dev/ttyUSB7");
     EXPECT_EQ(com2.name, "ttyUSB7");
-    EXPECT_FALSE(com2.description.empty());
+    EXPECT_EQ(com2.description, "set by ZX917_COM2");
+    EXPECT_FALSE(DescribedComDevice(2).description.empty());
     EXPECT_EQ(QtSerialPort::DevicePath(2), "/dev/ttyUSB7");
     EXPECT_EQ(ComDevice(1).path, OrderPorts(SystemPorts()).empty()
                                      ? std::string()
                                      : OrderPorts(SystemPorts()).front().path);
     EXPECT_EQ(ComDevice(0).path, "");
+    // The wait before looking at the output queue again: its line time.
+    EXPECT_EQ(QtSerialPort::DrainWait(44, "38400,E,8,1").count(), 12);  // 11 bits a byte
+    EXPECT_EQ(QtSerialPort::DrainWait(1, "38400,E,8,1").count(), 1);
+    EXPECT_EQ(QtSerialPort::DrainWait(4000, "9600,n,8,1").count(), 50);
+    EXPECT_EQ(QtSerialPort::DrainWait(10, "bad").count(), 2);
     ::unsetenv("ZX917_COM2");
     ::unsetenv("ZX917_COM1");
 }

@@ -38,15 +38,22 @@ SystemPort ComDevice(int16_t port) {
         SystemPort p;
         p.path = env;
         p.name = p.path.substr(p.path.find_last_of('/') + 1);
-        for (const SystemPort& s : SystemPorts()) {
-            if (s.path == p.path) p.description = s.description;
-        }
-        if (p.description.empty()) p.description = "set by " + var;
+        p.description = "set by " + var;
         return p;
     }
     const auto ports = SystemPorts();
     if (port < 1 || static_cast<std::size_t>(port) > ports.size()) return {};
     return ports[port - 1];
+}
+
+SystemPort DescribedComDevice(int16_t port) {
+    SystemPort p = ComDevice(port);
+    if (p.path.empty()) return p;
+    // A variable names only the path: the system knows what is behind it.
+    for (const SystemPort& s : SystemPorts()) {
+        if (s.path == p.path && !s.description.empty()) p.description = s.description;
+    }
+    return p;
 }
 
 }  // namespace zx917

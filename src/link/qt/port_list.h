@@ -21,7 +21,9 @@ std::vector<SystemPort> OrderPorts(std::vector<SystemPort> ports);
 // The ports the system lists now, ordered.
 std::vector<SystemPort> SystemPorts();
 
-// The device of port n and its description; an empty path when there is none.
+// The device of port n; an empty path when there is none. Quick when a variable names it.
 SystemPort ComDevice(int16_t port);
+// The same with the system's description of the device, also when a variable names it.
+SystemPort DescribedComDevice(int16_t port);
 
 }  // namespace zx917

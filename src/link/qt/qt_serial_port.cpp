@@ -2,6 +2,7 @@
 
 #include <sys/ioctl.h>
 
+#include <algorithm>
 #include <cerrno>
 #include <cstdlib>
 #include <cstring>
@@ -152,11 +153,21 @@ void QtSerialPort::clearOutBuffer() {
     if (port_.isOpen()) port_.clear(QSerialPort::Output);
 }
 
+// How long the bytes still queued take on the line; rechecking no sooner saves the wakeups of a
+// short poll, rechecking no later keeps the send event on time.
+std::chrono::milliseconds QtSerialPort::DrainWait(int32_t queued, const std::string& settings) {
+    const auto s = ParseLineSettings(settings);
+    if (!s || s->baud <= 0) return kDrainRecheck;
+    const double bits = 1 + s->dataBits + (s->parity == 'n' ? 0 : 1) + (s->stopBits == "1" ? 1 : 2);
+    const auto ms = static_cast<int64_t>(queued * bits * 1000 / s->baud);
+    return std::chrono::milliseconds(std::clamp<int64_t>(ms, 1, kDrainWaitLimit.count()));
+}
+
 // The send event comes when Qt's buffer and the kernel's queue are both empty.
 void QtSerialPort::checkDrained() {
     if (!sendPending_ || !port_.isOpen() || port_.bytesToWrite() > 0) return;
-    if (KernelOutQueue(port_.handle()) > 0) {
-        drainCheck_.start(kDrainRecheck);
+    if (const int32_t queued = KernelOutQueue(port_.handle()); queued > 0) {
+        drainCheck_.start(DrainWait(queued, settings_));
         return;
     }
     sendPending_ = false;

@@ -58,6 +58,13 @@ private:
 
     static constexpr std::chrono::milliseconds kDsrPoll{100};
     static constexpr std::chrono::milliseconds kDrainRecheck{2};
+    static constexpr std::chrono::milliseconds kDrainWaitLimit{50};
+
+public:
+    // The time to wait before looking at the kernel's output queue again.
+    static std::chrono::milliseconds DrainWait(int32_t queued, const std::string& settings);
+
+private:
 
     QSerialPort port_;
     QTimer dsrPoll_;

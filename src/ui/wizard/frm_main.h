@@ -2,15 +2,18 @@
 // update and the owner of the help viewer; the port, timers and engine come from the program.
 #pragma once
 
+#include <QElapsedTimer>
 #include <QGroupBox>
 #include <QLabel>
 #include <QProgressBar>
 #include <QPushButton>
 #include <QStringList>
+#include <QTimer>
 #include <QWidget>
 #include <array>
 #include <functional>
 #include <memory>
+#include <optional>
 #include <string>
 
 #include "app/app_state.h"
@@ -112,12 +115,21 @@ private:
     void buildSummary(int page);
     void SetPage(int page, bool show);
     std::vector<QWidget*> pageTabStops(int page) const;
+    // The transfer page's bar, byte count and remaining time change with every record; they are
+    // shown at most every kProgressRefresh, the latest values always.
+    void showProgressSoon();
+    void showProgressNow();
 
     WizardParts p_;
     FirmwareOperations ops_;
     HelpViewer help_;
     EnterClicks enterClicks_;
     std::string helpFile_;
+    QTimer progressTimer_;
+    QElapsedTimer progressShown_;
+    std::optional<int32_t> pendingValue_;
+    std::optional<QString> pendingBytes_;
+    std::optional<QString> pendingRemaining_;
 };
 
 // Sets a label's caption; a label designed to size itself to its text does so.

@@ -32,6 +32,8 @@ FrmMain::FrmMain(const WizardParts& parts)
     design.setBold(true);
     setFont(design);
     buildPages();
+    progressTimer_.setSingleShot(true);
+    connect(&progressTimer_, &QTimer::timeout, this, [this] { showProgressNow(); });
     auto* f1 = new QShortcut(QKeySequence(Qt::Key_F1), this);
     f1->setContext(Qt::WindowShortcut);
     connect(f1, &QShortcut::activated, this, [this] {

@@ -238,6 +238,7 @@ void FrmMain::SetPage(int n, bool show) {
 }
 
 void FrmMain::GoToPage(int page) {
+    showProgressNow();
     for (int n = 0; n < kPages; ++n) SetPage(n, n == page);
 }
 

@@ -20,7 +20,7 @@ int scaled(int normalMs, int tickMs) {
 }  // namespace
 
 std::string DescribeComPort(int16_t port) {
-    const SystemPort d = ComDevice(port);
+    const SystemPort d = DescribedComDevice(port);
     if (d.path.empty()) return {};
     return d.description.empty() ? d.path : d.path + " - " + d.description;
 }
