@@ -1,6 +1,7 @@
 # Installs the Debian packages the project needs, only when one is missing.
+# fonts-liberation2 is metric-compatible with Arial, the windows' design font.
 zx917_packages=(cmake g++ ninja-build pkg-config qt6-base-dev qt6-serialport-dev
-    libgtest-dev libgmock-dev socat time python3 clang libclang-rt-14-dev)
+    libgtest-dev libgmock-dev socat time python3 clang libclang-rt-14-dev fonts-liberation2)
 
 ensure_deps() {
     local missing=()

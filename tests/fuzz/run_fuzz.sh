@@ -8,7 +8,10 @@ source "$zx917_root/tools/deps.sh"
 
 ensure_deps
 dir="$zx917_root/build-fuzz"
-CXX=clang++ build_project "$dir" -DZX917_FUZZ=ON -DCMAKE_CXX_COMPILER=clang++ >/dev/null
+targets=(fuzz_download_file fuzz_reception fuzz_settings fuzz_avi zx917-mkfile zx917-clipgen)
+cmake -S "$zx917_root" -B "$dir" -G Ninja -DCMAKE_BUILD_TYPE=RelWithDebInfo -DZX917_FUZZ=ON \
+    -DCMAKE_CXX_COMPILER=clang++ >/dev/null
+cmake --build "$dir" -j"$(nproc)" --target "${targets[@]}" >/dev/null
 corpus="$dir/corpus"
 bash "$zx917_root/tests/fuzz/make_seeds.sh" "$corpus" "$dir/tools/zx917-mkfile" \
     "$dir/tools/zx917-clipgen"
