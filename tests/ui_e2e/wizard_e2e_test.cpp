@@ -2,6 +2,8 @@
 // against zx917-sim; closing it while it waits; one copy at a time.
 #include <signal.h>
 
+#include <QRegularExpression>
+
 #include "ui_e2e/e2e_support.h"
 
 namespace zx917 {
@@ -60,6 +62,15 @@ TEST(E2e_Wizard, IdentifiesTheSimulatorAndShowsItsRevision) {
     EXPECT_TRUE(answer.texts.empty());
     const std::string report = sim.stop();
     EXPECT_NE(report.find("\"command\": \"REVD X.XX.XX\""), std::string::npos);
+    // The support trace: every byte with its settings, and the speed switch.
+    e.program->trace->flush();
+    QFile trace(QString::fromStdString(e.folder.dir.path() + "/trace.txt"));
+    ASSERT_TRUE(trace.open(QIODevice::ReadOnly));
+    const QString t = QString::fromUtf8(trace.readAll());
+    EXPECT_TRUE(t.contains("TX [9600,n,8,1] *CLS\\n")) << t.toStdString();
+    EXPECT_TRUE(t.contains("-- switch to 38400,E,8,1"));
+    EXPECT_TRUE(t.contains(QRegularExpression("RX \\[38400,E,8,1 hs3\\] [^\\n]*REV B\\.03\\.07")))
+        << t.toStdString();
 }
 
 TEST(E2e_Wizard, SilentInstrumentBackOnPageZeroWithThePortClosed) {

@@ -76,6 +76,7 @@ void TraceWriter::flush() {
     if (rx_.empty()) return;
     line("RX", rxSettings_, printable(rx_), rxStamp_);
     rx_.clear();
+    out_.flush();
 }
 
 void AttachTrace(TraceWriter& trace, QtSerialPort& port, Engine& engine) {

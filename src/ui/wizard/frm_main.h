@@ -68,6 +68,13 @@ public:
     void Form_Unload();
 
     void GoToPage(int page) override;
+    // The page procedures: each shows or hides its page and does the page's own work.
+    void SetPage0(bool show) { SetPage(0, show); }
+    void SetPage1(bool show) { SetPage(1, show); }
+    void SetPage2(bool show) { SetPage(2, show); }
+    void SetPage3(bool show) { SetPage(3, show); }
+    void SetPage4(bool show) { SetPage(4, show); }
+    void SetPage5(bool show) { SetPage(5, show); }
     void SetTabOrder();
     void REV_Font();
     // The page shown: the one whose container is visible.

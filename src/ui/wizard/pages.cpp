@@ -239,7 +239,12 @@ void FrmMain::SetPage(int n, bool show) {
 
 void FrmMain::GoToPage(int page) {
     showProgressNow();
-    for (int n = 0; n < kPages; ++n) SetPage(n, n == page);
+    SetPage0(page == 0);
+    SetPage1(page == 1);
+    SetPage2(page == 2);
+    SetPage3(page == 3);
+    SetPage4(page == 4);
+    SetPage5(page == 5);
 }
 
 int FrmMain::currentPage() const {
