@@ -99,7 +99,7 @@ TEST(Clip_Transfer, PlaysWhileTheTransferRunsAndStopsOnEveryEnd) {
         ui::ClipPlayer& clip = *r.w().Animation1;
         ASSERT_TRUE(clip.loaded());
         EXPECT_EQ(clip.frameCount(), 16);
-        EXPECT_EQ(clip.intervalMs(), 75);
+        EXPECT_EQ(clip.intervalMs(), 100);
         EXPECT_FALSE(clip.playing());
         ASSERT_TRUE(r.toPage2());
         r.choose(DownloadFile("A.02.00", 6), "A.02.00");

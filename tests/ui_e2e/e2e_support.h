@@ -104,6 +104,13 @@ struct ProgramFolder {
     gen::TempDir dir;
 };
 
+// A download file of our records made by zx917-mkfile; returns its path.
+inline std::string MakeDownloadFile(const std::string& path, const char* revision) {
+    QProcess::execute(QString::fromStdString(kBuildDir + "/tools/zx917-mkfile"),
+                      {"--revision", revision, "--bytes", "12000", QString::fromStdString(path)});
+    return path;
+}
+
 // Turns the event loop until the condition holds or the time is up.
 inline bool waitFor(const std::function<bool()>& done, int ms) {
     QElapsedTimer t;

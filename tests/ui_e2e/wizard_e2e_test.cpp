@@ -95,9 +95,7 @@ TEST(E2e_Wizard, SilentInstrumentBackOnPageZeroWithThePortClosed) {
 TEST(E2e_Wizard, WholeDownloadByClicksAndKeys) {
     gen::TempDir dir;
     ModalAnswerer answer;
-    const std::string file = dir.path() + "/NEW.HEX";
-    QProcess::execute(QString::fromStdString(test::kBuildDir + "/tools/zx917-mkfile"),
-                      {"--revision", "A.02.00", "--bytes", "12000", QString::fromStdString(file)});
+    const std::string file = test::MakeDownloadFile(dir.path() + "/NEW.HEX", "A.02.00");
     SimProcess sim(dir.path(), {"--revision", "A.01.02", "--expect", QString::fromStdString(file),
                                 "--once"});
     ASSERT_TRUE(sim.ready());
@@ -147,9 +145,7 @@ TEST(E2e_Wizard, WholeDownloadByClicksAndKeys) {
 TEST(E2e_Wizard, AbortMidTransferEndsOnPageZero) {
     gen::TempDir dir;
     ModalAnswerer answer;
-    const std::string file = dir.path() + "/NEW.HEX";
-    QProcess::execute(QString::fromStdString(test::kBuildDir + "/tools/zx917-mkfile"),
-                      {"--revision", "A.02.00", "--bytes", "12000", QString::fromStdString(file)});
+    const std::string file = test::MakeDownloadFile(dir.path() + "/NEW.HEX", "A.02.00");
     SimProcess sim(dir.path(), {"--expect", QString::fromStdString(file), "--fault", "abort:DL:40"});
     ASSERT_TRUE(sim.ready());
     ::setenv("ZX917_COM1", sim.link().c_str(), 1);

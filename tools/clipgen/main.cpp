@@ -13,7 +13,7 @@ namespace {
 constexpr int kWidth = 208;
 constexpr int kHeight = 52;
 constexpr int kFrames = 16;
-constexpr int32_t kFrameUs = 75000;
+constexpr int32_t kFrameUs = 100000;  // ten frames a second: calm, and cheap to show
 
 enum Colour : uint8_t { kBack, kFolder, kFolderDark, kOutline, kSheet, kText, kTab };
 

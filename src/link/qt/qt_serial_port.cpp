@@ -125,6 +125,9 @@ bool QtSerialPort::output(std::span<const uint8_t> bytes) {
     }
     if (onTraffic) onTraffic(true, bytes);
     sendPending_ = true;
+    // Hand the bytes to the kernel now rather than at the next turn of the event loop: every
+    // record waits for its answer, and the answer for the record.
+    port_.flush();
     return true;
 }
 

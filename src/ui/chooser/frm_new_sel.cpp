@@ -96,7 +96,6 @@ FrmNewSel::FrmNewSel(const ChooserParts& parts, QWidget* owner)
     FileName->installEventFilter(this);
     RetFile->lineEdit()->installEventFilter(this);
     connect(drvlist, &QComboBox::activated, this, [this] { drvlist_Change(); });
-    dirlist->onChange = [this] { dirlist_Change(); };
     dirlist->onFailure = [this] { couldNotRead(); };
     connect(File, &QListWidget::itemSelectionChanged, this, [this] { File_Click(); });
     connect(RetFile, &QComboBox::activated, this, [this] { RetFile_Click(); });
@@ -110,10 +109,10 @@ FrmNewSel::FrmNewSel(const ChooserParts& parts, QWidget* owner)
     for (const Volume& v : MountedVolumes()) {
         drvlist->addItem(v.shown, QByteArray::fromStdString(v.root));
     }
-    // The folder list starts at the process's current folder.
-    const std::string cwd = ToFileName(QDir::currentPath());
-    dirlist->setPath(cwd);
+    // The folder list starts at the process's current folder; that is no change of folder.
+    dirlist->setPath(ToFileName(QDir::currentPath()));
     showDriveOf(dirlist->path());
+    dirlist->onChange = [this] { dirlist_Change(); };
 }
 
 void FrmNewSel::showDriveOf(const std::string& folder) {

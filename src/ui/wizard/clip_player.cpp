@@ -7,6 +7,9 @@
 namespace zx917::ui {
 
 ClipPlayer::ClipPlayer(QWidget* parent) : QWidget(parent) {
+    // Each frame paints the whole box itself: the page behind it is not painted again with
+    // every frame, which the transfer's event loop would pay for.
+    setAttribute(Qt::WA_OpaquePaintEvent);
     timer_.setTimerType(Qt::CoarseTimer);
     QObject::connect(&timer_, &QTimer::timeout, this, [this] {
         current_ = (current_ + 1) % frameCount();
@@ -43,10 +46,18 @@ void ClipPlayer::stop() {
 }
 
 void ClipPlayer::paintEvent(QPaintEvent*) {
-    if (frames_.empty()) return;
-    const QImage& f = frames_[current_];
     QPainter p(this);
-    p.drawImage((width() - f.width()) / 2, (height() - f.height()) / 2, f);
+    const QRect box = rect();
+    if (frames_.empty()) {
+        p.fillRect(box, palette().color(QPalette::Window));
+        return;
+    }
+    const QImage& f = frames_[current_];
+    const QRect at((width() - f.width()) / 2, (height() - f.height()) / 2, f.width(), f.height());
+    // Around the frame the page shows; the frame covers the rest.
+    const QRegion around = QRegion(box).subtracted(at);
+    for (const QRect& r : around) p.fillRect(r, palette().color(QPalette::Window));
+    p.drawImage(at.topLeft(), f);
 }
 
 }  // namespace zx917::ui
