@@ -1,10 +1,11 @@
 // Start-up on disk: the "HEX" folder beside the program, whatever is or is not there.
+#include "app/startup.h"
+
 #include <gtest/gtest.h>
 #include <sys/stat.h>
 
 #include <filesystem>
 
-#include "app/startup.h"
 #include "common/download_files.h"
 
 namespace zx917 {

@@ -1,10 +1,11 @@
 // Which device Com1 and Com2 stand for: the variables first, else adapters before built-in
 // ports, each group by name.
+#include "link/qt/port_list.h"
+
 #include <gtest/gtest.h>
 
 #include <cstdlib>
 
-#include "link/qt/port_list.h"
 #include "link/qt/qt_serial_port.h"
 
 namespace zx917 {
@@ -31,7 +32,8 @@ TEST(PortList_Order, AdaptersFirstThenBuiltInEachByName) {
           port("ttyUSB0", true)},
          {"ttyACM0", "ttyUSB0", "ttyUSB1", "ttyS0", "ttyS1"}},
         {"built-in only", {port("ttyS4", false), port("ttyS10", false)}, {"ttyS10", "ttyS4"}},
-        {"a USB adapter with another name", {port("ttyS0", false), port("rfcomm0", true)},
+        {"a USB adapter with another name",
+         {port("ttyS0", false), port("rfcomm0", true)},
          {"rfcomm0", "ttyS0"}},
         {"none", {}, {}},
     };

@@ -1,5 +1,7 @@
 // The Qt serial adapter on a pseudo-terminal: the DSR poll through the modem-line seam, and the
 // engine's DSR recovery through the real adapter, timers and event loop.
+#include "link/qt/qt_serial_port.h"
+
 #include <gtest/gtest.h>
 #include <sys/ioctl.h>
 
@@ -13,7 +15,6 @@
 #include "link/command_script.h"
 #include "link/engine.h"
 #include "link/qt/qt_platform.h"
-#include "link/qt/qt_serial_port.h"
 #include "support/pty.h"
 
 namespace zx917 {

@@ -36,8 +36,8 @@ bool SimSerialPort::setPortOpen(bool open) {
 }
 
 bool SimSerialPort::output(std::span<const uint8_t> bytes) {
-    const bool refused = !failWritesOf.empty() &&
-                         std::string(bytes.begin(), bytes.end()).starts_with(failWritesOf);
+    const bool refused =
+        !failWritesOf.empty() && std::string(bytes.begin(), bytes.end()).starts_with(failWritesOf);
     if (!open_ || failWrites || refused || vanished_) {
         error_ = "Input/output error";
         return false;

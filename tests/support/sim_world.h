@@ -150,7 +150,7 @@ public:
     std::vector<Sent> sent;
     std::vector<std::string> settingsHistory;  // every accepted settings change while open
     bool present = true;
-    std::set<int16_t> absent;  // port numbers that cannot be opened (missing or held elsewhere)
+    std::set<int16_t> absent;      // port numbers that cannot be opened (missing or held elsewhere)
     bool anySettingsText = false;  // keeps any settings text, as a port that never checks
     bool failWrites = false;
     std::string failWritesOf;  // refuse the writes whose text starts with this

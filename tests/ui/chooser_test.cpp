@@ -87,8 +87,11 @@ TEST(Chooser_Keys, NameAndTypeBoxFilters) {
         {"type box refuses blanks and separators", true, "", typed("* /:\\x"), "*X"},
         {"type box stops at 12 bytes", true, "", typed("ABCDEFGHIJKLMN"), "ABCDEFGHIJKL"},
         {"underscores do not count", true, "", typed("A_B_C_DEFGHIJKLMNO"), "A_B_C_DEFGHIJKL"},
-        {"backspace at the limit", true, "ABCDEFGHIJKL",
-         {{Qt::Key_Backspace, ""}, {Qt::Key_unknown, "Z"}}, "ABCDEFGHIJKZ"},
+        {"backspace at the limit",
+         true,
+         "ABCDEFGHIJKL",
+         {{Qt::Key_Backspace, ""}, {Qt::Key_unknown, "Z"}},
+         "ABCDEFGHIJKZ"},
     };
     for (const Case& c : cases) {
         SCOPED_TRACE(c.name);
@@ -141,23 +144,45 @@ TEST(Chooser_Check, FirmRevInfoOutcomes) {
     struct Case {
         const char* name;
         std::string current;
-        std::string file;       // content's revision; empty: not a download file
-        bool create;            // false: the name is typed for a file that does not exist
+        std::string file;  // content's revision; empty: not a download file
+        bool create;       // false: the name is typed for a file that does not exist
         std::deque<bool> answers;
         bool accepted;
         std::vector<Shown> shown;
     };
     const std::string hw =
-        "To download this firmware, you need to change the hardware.\r\nDid you change the hardware?";
+        "To download this firmware, you need to change the hardware.\r\nDid you change the "
+        "hardware?";
     const Case cases[] = {
         {"same hardware", "A.01.02", "A.02.00", true, {}, true, {}},
-        {"other hardware, OK", "B.01.02", "A.02.00", true, {true}, true, {{"beep", ""}, {"question", hw}}},
-        {"other hardware, Cancel", "B.01.02", "A.02.00", true, {false}, false,
+        {"other hardware, OK",
+         "B.01.02",
+         "A.02.00",
+         true,
+         {true},
+         true,
+         {{"beep", ""}, {"question", hw}}},
+        {"other hardware, Cancel",
+         "B.01.02",
+         "A.02.00",
+         true,
+         {false},
+         false,
          {{"beep", ""}, {"question", hw}}},
         {"unknown instrument revision: never asked", "?.??.??", "C.02.00", true, {}, true, {}},
-        {"not a download file", "A.01.02", "", true, {}, false,
+        {"not a download file",
+         "A.01.02",
+         "",
+         true,
+         {},
+         false,
          {{"beep", ""}, {"critical", "This is not the download file."}}},
-        {"no such file", "A.01.02", "A.02.00", false, {}, false,
+        {"no such file",
+         "A.01.02",
+         "A.02.00",
+         false,
+         {},
+         false,
          {{"beep", ""}, {"critical", "Could not read file."}}},
     };
     for (const Case& c : cases) {
@@ -188,11 +213,11 @@ TEST(Chooser_Names, UpperCaseResolvesToTheRealFile) {
     ChooserRig r;
     r.folder.write("HEX/lower.hex", DownloadFile("A.02.00"));
     r.folder.write("HEX/two.hex", DownloadFile("A.03.00"));
-    r.folder.write("HEX/TWO.HEX", DownloadFile("A.04.00"));  // the exact name wins
+    r.folder.write("HEX/TWO.HEX", DownloadFile("A.04.00"));       // the exact name wins
     r.folder.write("HEX/\xff\xfe.hex", DownloadFile("A.05.00"));  // not valid UTF-8
     auto& c = r.open();
-    const std::vector<std::pair<std::string, std::string>> picks = {
-        {"LOWER.HEX", "lower.hex"}, {"TWO.HEX", "TWO.HEX"}};
+    const std::vector<std::pair<std::string, std::string>> picks = {{"LOWER.HEX", "lower.hex"},
+                                                                    {"TWO.HEX", "TWO.HEX"}};
     for (const auto& [shown, real] : picks) {
         SCOPED_TRACE(shown);
         r.pick(QString::fromStdString(shown));

@@ -34,8 +34,8 @@ TEST(Help_File, HasEveryTopic) {
     }
     for (const char* message :
          {"Communication port not available.", "Communication port does not exist,",
-          "Could not read file.", "This is not the download file.", "Download failed.",
-          "dialout", "ZX917_COM1"}) {
+          "Could not read file.", "This is not the download file.", "Download failed.", "dialout",
+          "ZX917_COM1"}) {
         EXPECT_TRUE(html.contains(message)) << message;
     }
 }
@@ -84,8 +84,8 @@ TEST(Clip_Transfer, PlaysWhileTheTransferRunsAndStopsOnEveryEnd) {
         std::string fault;
         int page;
     };
-    const Case cases[] = {{"confirmed", "", 5}, {"aborted", "abort:DL:3", 0},
-                          {"silent at CLOSE", "silent:CLOSE", 0}};
+    const Case cases[] = {
+        {"confirmed", "", 5}, {"aborted", "abort:DL:3", 0}, {"silent at CLOSE", "silent:CLOSE", 0}};
     for (const Case& c : cases) {
         SCOPED_TRACE(c.name);
         InstrumentOptions o;

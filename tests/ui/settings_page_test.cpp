@@ -58,8 +58,9 @@ TEST(Settings_Probe, ListsThePresentPortsAndSelects) {
             EXPECT_EQ(s.cboPort->itemData(s.cboPort->currentIndex(), Qt::ToolTipRole).toString(),
                       "/dev/ttyUSB" + QString::number(n.toInt() - 1) + " - test adapter");
         } else {
-            EXPECT_EQ(r.shown(), (std::vector<Shown>{
-                                     {"beep", ""}, {"critical", "Communication port not available."}}));
+            EXPECT_EQ(r.shown(),
+                      (std::vector<Shown>{{"beep", ""},
+                                          {"critical", "Communication port not available."}}));
             EXPECT_EQ(items(s.cboSpeed), QStringList({"kept"}));
         }
     }

@@ -40,15 +40,28 @@ TEST(Wizard_Flow, TransitionsRowByRow) {
     };
     InstrumentOptions abortMid;
     const Case cases[] = {
-        {"0 Next, ports present", nullptr, true,
-         [](WizardRig& r) { r.click(r.w().CmdNext[0]); }, 1, {}, false, 0},
-        {"0 Next, no port", nullptr, true,
+        {"0 Next, ports present",
+         nullptr,
+         true,
+         [](WizardRig& r) { r.click(r.w().CmdNext[0]); },
+         1,
+         {},
+         false,
+         0},
+        {"0 Next, no port",
+         nullptr,
+         true,
          [](WizardRig& r) {
              r.world.port.absent = {1, 2};
              r.click(r.w().CmdNext[0]);
          },
-         0, {{"beep", ""}, {"critical", "Communication port not available."}}, false, 0},
-        {"1 Next, port taken by another program meanwhile", nullptr, true,
+         0,
+         {{"beep", ""}, {"critical", "Communication port not available."}},
+         false,
+         0},
+        {"1 Next, port taken by another program meanwhile",
+         nullptr,
+         true,
          [](WizardRig& r) {
              r.click(r.w().CmdNext[0]);
              r.w().settings->cboPort->setCurrentIndex(1);  // Com2
@@ -56,14 +69,24 @@ TEST(Wizard_Flow, TransitionsRowByRow) {
              r.click(r.w().CmdNext[1]);
              EXPECT_EQ(r.world.port.commPort(), 1);  // the number is back
          },
-         1, {{"critical", kPortMissing}}, false, 0},
-        {"1 Next, instrument silent", nullptr, false,
+         1,
+         {{"critical", kPortMissing}},
+         false,
+         0},
+        {"1 Next, instrument silent",
+         nullptr,
+         false,
          [](WizardRig& r) {
              EXPECT_FALSE(r.toPage2());
              EXPECT_GE(r.world.clock.now(), 84000);
          },
-         0, {{"critical", kPortMissing}}, false, 0},
-        {"1 Next, identified", nullptr, true,
+         0,
+         {{"critical", kPortMissing}},
+         false,
+         0},
+        {"1 Next, identified",
+         nullptr,
+         true,
          [](WizardRig& r) {
              r.world.app.SelectedFileName = "OLD.HEX";
              r.world.app.SelectedRevision = "A.00.01";
@@ -75,27 +98,47 @@ TEST(Wizard_Flow, TransitionsRowByRow) {
              EXPECT_EQ(r.world.app.SelectedFileName, "");
              EXPECT_EQ(r.world.app.SelectedRevision.str(), "       ");
          },
-         2, {}, true, 0},
-        {"2 Next, older instrument", nullptr, true,
+         2,
+         {},
+         true,
+         0},
+        {"2 Next, older instrument",
+         nullptr,
+         true,
          [](WizardRig& r) {
              toPage3(r, "A.02.00");
              EXPECT_EQ(r.w().RemTime[2]->text(), "02:40");
          },
-         3, {}, true, 0},
-        {"2 Next, same revision, OK", nullptr, true,
+         3,
+         {},
+         true,
+         0},
+        {"2 Next, same revision, OK",
+         nullptr,
+         true,
          [](WizardRig& r) {
              r.dialogs.answers = {true};
              toPage3(r, "A.01.02");
          },
-         3, {{"question", kNewer}}, true, 0},
-        {"2 Next, newer instrument, Cancel", nullptr, true,
+         3,
+         {{"question", kNewer}},
+         true,
+         0},
+        {"2 Next, newer instrument, Cancel",
+         nullptr,
+         true,
          [](WizardRig& r) {
              ASSERT_TRUE(r.toPage2());
              r.choose(DownloadFile("B.01.00"), "B.01.00");
              r.click(r.w().CmdNext[2]);
          },
-         2, {{"question", kNewer}}, true, 0},
-        {"2 Next, file turned bad after its choice", nullptr, true,
+         2,
+         {{"question", kNewer}},
+         true,
+         0},
+        {"2 Next, file turned bad after its choice",
+         nullptr,
+         true,
          [](WizardRig& r) {
              ASSERT_TRUE(r.toPage2());
              r.choose(DownloadFile("A.02.00"), "A.02.00");
@@ -103,8 +146,13 @@ TEST(Wizard_Flow, TransitionsRowByRow) {
                                            std::string(60, 'x') + "\r\n[EOF]\r\n");
              r.click(r.w().CmdNext[2]);
          },
-         2, {{"beep", ""}, {"critical", "This is not the download file."}}, true, 0},
-        {"3 Back keeps the choice and asks again", nullptr, true,
+         2,
+         {{"beep", ""}, {"critical", "This is not the download file."}},
+         true,
+         0},
+        {"3 Back keeps the choice and asks again",
+         nullptr,
+         true,
          [](WizardRig& r) {
              r.dialogs.answers = {true};
              toPage3(r, "A.01.02");
@@ -114,16 +162,26 @@ TEST(Wizard_Flow, TransitionsRowByRow) {
              EXPECT_TRUE(r.w().CmdNext[2]->isEnabled());
              r.click(r.w().CmdNext[2]);  // asked again, answered Cancel
          },
-         2, {{"question", kNewer}, {"question", kNewer}}, true, 0},
-        {"3 Execute, Cancel: nothing sent", nullptr, true,
+         2,
+         {{"question", kNewer}, {"question", kNewer}},
+         true,
+         0},
+        {"3 Execute, Cancel: nothing sent",
+         nullptr,
+         true,
          [](WizardRig& r) {
              toPage3(r);
              const auto sent = r.world.port.sent.size();
              r.click(r.w().CmdNext[3]);
              EXPECT_EQ(r.world.port.sent.size(), sent);
          },
-         3, {{"question", "OK to start the download?"}}, true, 0},
-        {"3 Execute, OK, confirmed", nullptr, true,
+         3,
+         {{"question", "OK to start the download?"}},
+         true,
+         0},
+        {"3 Execute, OK, confirmed",
+         nullptr,
+         true,
          [](WizardRig& r) {
              toPage3(r);
              r.dialogs.answers = {true};
@@ -132,7 +190,10 @@ TEST(Wizard_Flow, TransitionsRowByRow) {
              EXPECT_EQ(r.w().RemTime[4]->text(), "00:00");
              EXPECT_FALSE(r.w().Animation1->playing());
          },
-         5, {{"question", "OK to start the download?"}}, true, 0},
+         5,
+         {{"question", "OK to start the download?"}},
+         true,
+         0},
         {"3 Execute, OK, instrument aborts mid-transfer",
          [](InstrumentOptions& o) {
              Fault f;
@@ -147,9 +208,13 @@ TEST(Wizard_Flow, TransitionsRowByRow) {
              EXPECT_FALSE(r.world.instrument->confirmed());
              EXPECT_EQ(r.world.port.settings(), "9600,n,8,1");
          },
-         0, {{"question", "OK to start the download?"}, {"critical", "Download failed."}}, false,
+         0,
+         {{"question", "OK to start the download?"}, {"critical", "Download failed."}},
+         false,
          0},
-        {"3 Execute, file removed", nullptr, true,
+        {"3 Execute, file removed",
+         nullptr,
+         true,
          [](WizardRig& r) {
              toPage3(r);
              std::filesystem::remove(r.world.app.FilePath);
@@ -157,10 +222,14 @@ TEST(Wizard_Flow, TransitionsRowByRow) {
              r.click(r.w().CmdNext[3]);
          },
          2,
-         {{"question", "OK to start the download?"}, {"beep", ""},
+         {{"question", "OK to start the download?"},
+          {"beep", ""},
           {"critical", "Could not read file."}},
-         true, 0},
-        {"5 Confirm ends the program", nullptr, true,
+         true,
+         0},
+        {"5 Confirm ends the program",
+         nullptr,
+         true,
          [](WizardRig& r) {
              toPage3(r);
              r.dialogs.answers = {true};
@@ -171,21 +240,34 @@ TEST(Wizard_Flow, TransitionsRowByRow) {
          5,
          {{"question", "OK to start the download?"},
           {"information", "OK to exit the download program?"}},
-         false, 1},
-        {"2 Cancel, OK: port closed, program ends", nullptr, true,
+         false,
+         1},
+        {"2 Cancel, OK: port closed, program ends",
+         nullptr,
+         true,
          [](WizardRig& r) {
              ASSERT_TRUE(r.toPage2());
              r.dialogs.answers = {true};
              r.click(r.w().CmdExit[2]);
          },
-         2, {{"question", "OK to quit the download?"}}, false, 1},
-        {"1 Cancel, Cancel: stays", nullptr, true,
+         2,
+         {{"question", "OK to quit the download?"}},
+         false,
+         1},
+        {"1 Cancel, Cancel: stays",
+         nullptr,
+         true,
          [](WizardRig& r) {
              r.click(r.w().CmdNext[0]);
              r.click(r.w().CmdExit[1]);
          },
-         1, {{"question", "OK to quit the download?"}}, false, 0},
-        {"window closed during the transfer", nullptr, true,
+         1,
+         {{"question", "OK to quit the download?"}},
+         false,
+         0},
+        {"window closed during the transfer",
+         nullptr,
+         true,
          [](WizardRig& r) {
              toPage3(r);
              r.dialogs.answers = {true};
@@ -199,7 +281,10 @@ TEST(Wizard_Flow, TransitionsRowByRow) {
              r.click(r.w().CmdNext[3]);
              EXPECT_FALSE(r.portOpenAtEnd);
          },
-         -1, {{"question", "OK to start the download?"}}, false, 1},
+         -1,
+         {{"question", "OK to start the download?"}},
+         false,
+         1},
     };
     for (const Case& c : cases) {
         SCOPED_TRACE(c.name);
@@ -221,7 +306,8 @@ TEST(Wizard_Flow, TransitionsRowByRow) {
         EXPECT_EQ(r.ended, c.ended);
         // Exactly one page visible and enabled, whatever happened.
         int visible = 0;
-        for (QWidget* page : r.w().Picture4) visible += page->isVisibleTo(&r.w()) && page->isEnabled();
+        for (QWidget* page : r.w().Picture4)
+            visible += page->isVisibleTo(&r.w()) && page->isEnabled();
         if (c.ended == 0) {
             EXPECT_EQ(visible, 1);
         }

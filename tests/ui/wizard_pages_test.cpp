@@ -18,7 +18,7 @@ using test::WizardRig;
 struct Control {
     const char* name;
     int page;
-    const char* caption;  // nullptr: not checked (set at run time, or a list)
+    const char* caption;           // nullptr: not checked (set at run time, or a list)
     int left, top, width, height;  // width -1: sized to its text
 };
 
@@ -157,8 +157,8 @@ TEST(Wizard_Pages, EveryControlAsDesigned) {
             expectTwips(w->y(), c.top, "top");
             if (c.width >= 0) expectTwips(w->width(), c.width, "width");
             if (c.height >= 0) expectTwips(w->height(), c.height, "height");
-            const bool large = std::string(c.name) == "CurFirmInfo_2" ||
-                               std::string(c.name) == "NewFirmInfo_2";
+            const bool large =
+                std::string(c.name) == "CurFirmInfo_2" || std::string(c.name) == "NewFirmInfo_2";
             if (qobject_cast<QLabel*>(w) || qobject_cast<QAbstractButton*>(w)) {
                 EXPECT_EQ(w->font().bold(), !large);
                 if (!large) {

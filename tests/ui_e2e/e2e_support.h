@@ -19,8 +19,8 @@
 #include <string>
 
 #include "common/download_files.h"
-#include "ui/chooser/frm_new_sel.h"
 #include "support/pty.h"
+#include "ui/chooser/frm_new_sel.h"
 #include "ui/wizard/program.h"
 
 namespace zx917::test {
@@ -68,9 +68,9 @@ public:
         QObject::connect(&timer_, &QTimer::timeout, [this] { look(); });
         timer_.start();
     }
-    std::deque<bool> answers;                      // questions: OK when true; Cancel when empty
-    std::function<void(ui::FrmNewSel&)> chooser;   // what to do in the file chooser
-    std::vector<std::string> texts;                // every message box's text
+    std::deque<bool> answers;                     // questions: OK when true; Cancel when empty
+    std::function<void(ui::FrmNewSel&)> chooser;  // what to do in the file chooser
+    std::vector<std::string> texts;               // every message box's text
 
 private:
     void look() {

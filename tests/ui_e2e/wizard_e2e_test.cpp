@@ -96,8 +96,8 @@ TEST(E2e_Wizard, WholeDownloadByClicksAndKeys) {
     gen::TempDir dir;
     ModalAnswerer answer;
     const std::string file = test::MakeDownloadFile(dir.path() + "/NEW.HEX", "A.02.00");
-    SimProcess sim(dir.path(), {"--revision", "A.01.02", "--expect", QString::fromStdString(file),
-                                "--once"});
+    SimProcess sim(dir.path(),
+                   {"--revision", "A.01.02", "--expect", QString::fromStdString(file), "--once"});
     ASSERT_TRUE(sim.ready());
     ::setenv("ZX917_COM1", sim.link().c_str(), 1);
     E2e e;
@@ -146,7 +146,8 @@ TEST(E2e_Wizard, AbortMidTransferEndsOnPageZero) {
     gen::TempDir dir;
     ModalAnswerer answer;
     const std::string file = test::MakeDownloadFile(dir.path() + "/NEW.HEX", "A.02.00");
-    SimProcess sim(dir.path(), {"--expect", QString::fromStdString(file), "--fault", "abort:DL:40"});
+    SimProcess sim(dir.path(),
+                   {"--expect", QString::fromStdString(file), "--fault", "abort:DL:40"});
     ASSERT_TRUE(sim.ready());
     ::setenv("ZX917_COM1", sim.link().c_str(), 1);
     E2e e;

@@ -46,7 +46,8 @@ void folder(Canvas& c, int x) {
 void sheet(Canvas& c, int x, int y) {
     c.fill(x, y, x + 16, y + 20, kSheet);
     c.frame(x, y, x + 16, y + 20, kOutline);
-    for (int line = 0; line < 4; ++line) c.fill(x + 3, y + 4 + 4 * line, x + 13, y + 5 + 4 * line, kText);
+    for (int line = 0; line < 4; ++line)
+        c.fill(x + 3, y + 4 + 4 * line, x + 13, y + 5 + 4 * line, kText);
 }
 
 }  // namespace
@@ -81,7 +82,8 @@ int main(int argc, char** argv) {
     }
     const auto bytes = zx917::WriteAvi(clip, true);
     std::ofstream out(argv[1], std::ios::binary);
-    out.write(reinterpret_cast<const char*>(bytes.data()), static_cast<std::streamsize>(bytes.size()));
+    out.write(reinterpret_cast<const char*>(bytes.data()),
+              static_cast<std::streamsize>(bytes.size()));
     if (!out) {
         std::cerr << "zx917-clipgen: cannot write " << argv[1] << "\n";
         return 1;

@@ -69,8 +69,7 @@ bool parse(const std::vector<std::string>& args, bool download, Options& o) {
         else if (a == "--tries" && hasValue) {
             o.tries = std::atoi(args[++i].c_str());
             if (o.tries < 1 || o.tries > 100) return false;
-        }
-        else
+        } else
             return false;
     }
     return !o.port.empty() && (!download || !o.file.empty()) && ParseLineSettings(o.settings);

@@ -21,9 +21,10 @@ std::vector<SystemPort> SystemPorts() {
         p.name = info.portName().toStdString();
         p.path = info.systemLocation().toStdString();
         p.description = info.description().toStdString();
-        if (!info.manufacturer().isEmpty() && p.description.find(info.manufacturer().toStdString()) ==
-                                                  std::string::npos) {
-            p.description += (p.description.empty() ? "" : ", ") + info.manufacturer().toStdString();
+        if (!info.manufacturer().isEmpty() &&
+            p.description.find(info.manufacturer().toStdString()) == std::string::npos) {
+            p.description +=
+                (p.description.empty() ? "" : ", ") + info.manufacturer().toStdString();
         }
         p.adapter = info.hasVendorIdentifier() || p.name.starts_with("ttyUSB") ||
                     p.name.starts_with("ttyACM");

@@ -65,7 +65,6 @@ public:
     static std::chrono::milliseconds DrainWait(int32_t queued, const std::string& settings);
 
 private:
-
     QSerialPort port_;
     QTimer dsrPoll_;
     QTimer drainCheck_;

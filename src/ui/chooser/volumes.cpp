@@ -12,10 +12,10 @@ namespace zx917::ui {
 
 bool IsPseudoFileSystem(const std::string& type, const std::string& root) {
     static constexpr std::array<std::string_view, 24> kPseudo = {
-        "proc",     "sysfs",      "devpts",   "devtmpfs",  "cgroup",      "cgroup2",
-        "securityfs", "debugfs",  "tracefs",  "mqueue",    "pstore",      "bpf",
-        "configfs", "fusectl",    "hugetlbfs", "autofs",   "binfmt_misc", "efivarfs",
-        "nsfs",     "rpc_pipefs", "squashfs", "fuse.portal", "fuse.gvfsd-fuse", "ramfs"};
+        "proc",       "sysfs",      "devpts",    "devtmpfs",    "cgroup",          "cgroup2",
+        "securityfs", "debugfs",    "tracefs",   "mqueue",      "pstore",          "bpf",
+        "configfs",   "fusectl",    "hugetlbfs", "autofs",      "binfmt_misc",     "efivarfs",
+        "nsfs",       "rpc_pipefs", "squashfs",  "fuse.portal", "fuse.gvfsd-fuse", "ramfs"};
     if (std::find(kPseudo.begin(), kPseudo.end(), type) != kPseudo.end()) return true;
     // The system's own folders; removable media under /run/media stay.
     for (std::string_view prefix : {"/proc", "/sys", "/dev", "/run", "/snap", "/boot/efi"}) {
@@ -38,7 +38,8 @@ std::vector<Volume> MountedVolumes() {
         if (!v.name().isEmpty() && v.name() != v.rootPath()) shown += " [" + v.name() + "]";
         out.push_back({root, shown});
     }
-    std::sort(out.begin(), out.end(), [](const Volume& a, const Volume& b) { return a.root < b.root; });
+    std::sort(out.begin(), out.end(),
+              [](const Volume& a, const Volume& b) { return a.root < b.root; });
     return out;
 }
 

@@ -25,7 +25,8 @@ public:
     }
     bool u32(uint32_t& v) {
         if (!has(4)) return false;
-        v = b_[pos_] | b_[pos_ + 1] << 8 | b_[pos_ + 2] << 16 | static_cast<uint32_t>(b_[pos_ + 3]) << 24;
+        v = b_[pos_] | b_[pos_ + 1] << 8 | b_[pos_ + 2] << 16 |
+            static_cast<uint32_t>(b_[pos_ + 3]) << 24;
         pos_ += 4;
         return true;
     }
@@ -137,7 +138,8 @@ void put(std::vector<uint32_t>& frame, const Format& f, int x, int storedY, uint
 }
 
 bool decodeRaw(std::span<const uint8_t> data, const Format& f, std::vector<uint32_t>& frame) {
-    const std::size_t stride = ((static_cast<std::size_t>(f.width) * f.bits / 8) + 3) & ~std::size_t{3};
+    const std::size_t stride =
+        ((static_cast<std::size_t>(f.width) * f.bits / 8) + 3) & ~std::size_t{3};
     if (data.size() < stride * f.height) return false;
     for (int y = 0; y < f.height; ++y) {
         const uint8_t* row = data.data() + stride * y;
@@ -229,7 +231,8 @@ std::optional<AviClip> ReadAvi(std::span<const uint8_t> bytes) {
     int64_t us = le32(avih->body, 0);
     const uint32_t scale = le32(strh->body, 20), rate = le32(strh->body, 24);
     if (us == 0 && scale > 0 && rate > 0) us = int64_t{1000000} * scale / rate;
-    clip.microsecondsPerFrame = static_cast<int32_t>(std::clamp<int64_t>(us ? us : 100000, 10000, 2000000));
+    clip.microsecondsPerFrame =
+        static_cast<int32_t>(std::clamp<int64_t>(us ? us : 100000, 10000, 2000000));
 
     std::vector<std::span<const uint8_t>> data;
     moviFrames(movi->body, data);
@@ -329,9 +332,9 @@ std::vector<uint8_t> WriteAvi(const AviPaletteClip& clip, bool rle8) {
     const std::size_t riff = w.begin("RIFF", "AVI ");
     const std::size_t hdrl = w.begin("LIST", "hdrl");
     const std::size_t avih = w.begin("avih");
-    for (uint32_t v : {static_cast<uint32_t>(clip.microsecondsPerFrame), 0u, 0u, 0x10u, frames,
-                       0u, 1u, 0u, static_cast<uint32_t>(clip.width),
-                       static_cast<uint32_t>(clip.height), 0u, 0u, 0u, 0u})
+    for (uint32_t v :
+         {static_cast<uint32_t>(clip.microsecondsPerFrame), 0u, 0u, 0x10u, frames, 0u, 1u, 0u,
+          static_cast<uint32_t>(clip.width), static_cast<uint32_t>(clip.height), 0u, 0u, 0u, 0u})
         w.u32(v);
     w.end(avih);
     const std::size_t strl = w.begin("LIST", "strl");

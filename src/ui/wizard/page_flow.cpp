@@ -38,8 +38,8 @@ FrmMain::FrmMain(const WizardParts& parts)
     f1->setContext(Qt::WindowShortcut);
     connect(f1, &QShortcut::activated, this, [this] {
         const int page = currentPage();
-        help_.show(helpFile_, page >= 0 ? Picture4[page]->property("helpContext").toInt()
-                                        : kF1Context);
+        help_.show(helpFile_,
+                   page >= 0 ? Picture4[page]->property("helpContext").toInt() : kF1Context);
     });
 }
 

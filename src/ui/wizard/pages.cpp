@@ -80,7 +80,9 @@ struct Summary {
     int captionIndex, openIndex, closeIndex;  // indexes of Label1 and Label2, and of Label5
 };
 constexpr Summary kSummary[kPages] = {
-    {}, {}, {},
+    {},
+    {},
+    {},  // pages 0 to 2 have no summary
     {500, 1095, 1104, 1692, 5640, 0, 11, 10},
     {480, 1080, 1104, 1812, 5760, 2, 1, 0},
     {495, 1080, 1100, 1692, 5640, 4, 4, 3},
@@ -175,8 +177,8 @@ void FrmMain::buildButtonRow(int n) {
     }
     if (n != 4) {
         const char* caption = n == 3 ? "&Execute >" : n == 5 ? "&Confirm" : "&Next >";
-        CmdNext[n] =
-            button(page, name("CmdNext", n), caption, 3960, kButtonTop, kButtonWidth, kButtonHeight);
+        CmdNext[n] = button(page, name("CmdNext", n), caption, 3960, kButtonTop, kButtonWidth,
+                            kButtonHeight);
         connectSet(CmdNext[n], &FrmMain::CmdNext_Click, n);
     }
     if (n <= 3) {
@@ -197,8 +199,8 @@ void FrmMain::buildSummary(int n) {
     label(page, name("Label2", s.captionIndex), "New Firmware", 360, s.newCaptionTop);
     NewFirmInfo[n] = label(page, name("NewFirmInfo", n), "", 2640, s.newTop);
     label(page, name("Label5", s.openIndex), "(", 3720, 1100);
-    NewFirmFile[n] = label(page, name("NewFirmFile", n), "", 3840, 1080, s.fileWidth, 255,
-                           Qt::AlignHCenter);
+    NewFirmFile[n] =
+        label(page, name("NewFirmFile", n), "", 3840, 1080, s.fileWidth, 255, Qt::AlignHCenter);
     NewFirmFile[n]->setWordWrap(false);
     label(page, name("Label5", s.closeIndex), ")", s.closeBracket, 1080);
 }
@@ -255,15 +257,23 @@ int FrmMain::currentPage() const {
 }
 
 void FrmMain::SetTabOrder() {
-    const std::vector<QWidget*> order = {
-        CmdNext[0],        CmdExit[0],           CmdHelp[0],          settings->cboPort,
-        settings->cboSpeed, settings->cboDataBits, settings->cboStopBits, settings->cboParity,
-        settings->cboXon,  settings->cboEoc,     settings->cmdReset,  CmdNext[1],
-        CmdExit[1],        CmdHelp[1],           CmdFirmSelect,       CmdNext[2],
-        CmdExit[2],        CmdHelp[2],           CmdNext[3],          CmdExit[3],
-        CmdHelp[3],        CmdBack[3],           CmdHelp[4],          CmdNext[5],
-        CmdHelp[5]};
-    for (std::size_t i = 0; i + 1 < order.size(); ++i) QWidget::setTabOrder(order[i], order[i + 1]);
+    // One order across the pages, tab index 0 first; hidden pages drop out of it by themselves.
+    const SettingsPage& s = *settings;
+    const std::vector<std::vector<QWidget*>> byPage = {
+        {CmdNext[0], CmdExit[0], CmdHelp[0]},
+        {s.cboPort, s.cboSpeed, s.cboDataBits, s.cboStopBits, s.cboParity, s.cboXon, s.cboEoc,
+         s.cmdReset, CmdNext[1], CmdExit[1], CmdHelp[1]},
+        {CmdFirmSelect, CmdNext[2], CmdExit[2], CmdHelp[2]},
+        {CmdNext[3], CmdExit[3], CmdHelp[3], CmdBack[3]},
+        {CmdHelp[4]},
+        {CmdNext[5], CmdHelp[5]}};
+    QWidget* previous = nullptr;
+    for (const auto& page : byPage) {
+        for (QWidget* w : page) {
+            if (previous != nullptr) QWidget::setTabOrder(previous, w);
+            previous = w;
+        }
+    }
 }
 
 void FrmMain::REV_Font() {

@@ -40,8 +40,10 @@ Program::Program(const ProgramOptions& o)
         std::fflush(nullptr);
         ::_exit(0);  // the waits for the instrument are not unwound: nothing may run after this
     };
-    WizardParts parts{app,     texts, script, port, timer1, engine, file, dialogs, programFolder,
-                      nullptr, DescribeComPort, [this] { endProcess(); }, nullptr};
+    WizardParts parts{
+        app,    texts,   script,        port,    timer1,          engine,
+        file,   dialogs, programFolder, nullptr, DescribeComPort, [this] { endProcess(); },
+        nullptr};
     window = std::make_unique<FrmMain>(parts);
     dialogs.setOwner(window.get());
 }
@@ -72,7 +74,7 @@ QIcon ProgramIcon() {
         p.drawRect(QRectF(3 * u, 5 * u, 6 * u, 4 * u));
         p.setPen(Qt::NoPen);
         p.setBrush(QColor(250, 200, 40));
-        const QPointF arrow[] = {{11 * u, 5 * u},  {14 * u, 5 * u},  {14 * u, 8 * u},
+        const QPointF arrow[] = {{11 * u, 5 * u},   {14 * u, 5 * u},    {14 * u, 8 * u},
                                  {15.5 * u, 8 * u}, {12.5 * u, 12 * u}, {9.5 * u, 8 * u},
                                  {11 * u, 8 * u}};
         p.drawPolygon(arrow, 7);
