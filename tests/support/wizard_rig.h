@@ -25,6 +25,12 @@ inline gen::Bytes DownloadFile(const std::string& revision, int records = 3) {
     return gen::Build(layout);
 }
 
+// A file with a download file's shape whose header tags are wrong: "This is not the download file."
+inline std::string NotADownloadFile() {
+    return "A.02.00\r\nMDSP:A\r\nCDMA:A\r\nGPS:A\r\nMPU:A\r\n" + std::string(60, 'x') +
+           "\r\n[EOF]\r\n";
+}
+
 struct WizardRig {
     explicit WizardRig(InstrumentOptions options = {}, bool withInstrument = true,
                        std::function<QStringList()> families = {})

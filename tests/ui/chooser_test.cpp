@@ -191,8 +191,7 @@ TEST(Chooser_Check, FirmRevInfoOutcomes) {
         r.app.CurrentRevision = c.current;
         if (c.create) {
             if (c.file.empty()) {
-                r.folder.write("HEX/F.HEX", "A.02.00\r\nMDSP:A\r\nCDMA:A\r\nGPS:A\r\nMPU:A\r\n" +
-                                                std::string(60, 'x') + "\r\n[EOF]\r\n");
+                r.folder.write("HEX/F.HEX", test::NotADownloadFile());
             } else {
                 r.folder.write("HEX/F.HEX", DownloadFile(c.file));
             }

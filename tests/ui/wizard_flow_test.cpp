@@ -142,8 +142,7 @@ TEST(Wizard_Flow, TransitionsRowByRow) {
          [](WizardRig& r) {
              ASSERT_TRUE(r.toPage2());
              r.choose(DownloadFile("A.02.00"), "A.02.00");
-             r.folder.write("NEW.HEX", "A.02.00\r\nMDSP:A\r\nCDMA:A\r\nGPS:A\r\nMPU:A\r\n" +
-                                           std::string(60, 'x') + "\r\n[EOF]\r\n");
+             r.folder.write("NEW.HEX", test::NotADownloadFile());
              r.click(r.w().CmdNext[2]);
          },
          2,
