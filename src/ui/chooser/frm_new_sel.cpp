@@ -1,9 +1,7 @@
 #include "ui/chooser/frm_new_sel.h"
 
 #include <QDir>
-#include <QGuiApplication>
 #include <QKeyEvent>
-#include <QScreen>
 #include <QSet>
 #include <QShortcut>
 
@@ -13,6 +11,7 @@
 #include "link/wildcard.h"
 #include "ui/chooser/folder_files.h"
 #include "ui/chooser/volumes.h"
+#include "ui/common/centre.h"
 #include "ui/common/qt_text.h"
 #include "ui/common/twips.h"
 
@@ -145,12 +144,7 @@ bool FrmNewSel::setDrive(const std::string& root) {
 }
 
 void FrmNewSel::Form_Load() {
-    if (windowState() == Qt::WindowNoState) {
-        if (const QScreen* screen = QGuiApplication::primaryScreen()) {
-            const QRect s = screen->geometry();
-            move(s.x() + (s.width() - width()) / 2, s.y() + (s.height() - height()) / 2);
-        }
-    }
+    CentreOnScreen(*this);
     setProperty("helpContext", kChooserHelpContext);
     // The file list reaches down to the folder list's bottom.
     File->setGeometry(File->x(), drvlist->y(), File->width(),

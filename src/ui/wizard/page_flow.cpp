@@ -1,11 +1,10 @@
 // The page flow: the load step, the forward, back and cancel buttons, and the unload step.
 #include <QCloseEvent>
-#include <QGuiApplication>
-#include <QScreen>
 #include <QShortcut>
 
 #include "app/identity.h"
 #include "firmware/revision.h"
+#include "ui/common/centre.h"
 #include "ui/common/qt_text.h"
 #include "ui/common/twips.h"
 #include "ui/wizard/frm_main.h"
@@ -56,12 +55,7 @@ void FrmMain::Form_Load() {
     REV_Font();
     SetTabOrder();
     GoToPage(0);
-    if (windowState() == Qt::WindowNoState) {
-        if (const QScreen* screen = QGuiApplication::primaryScreen()) {
-            const QRect s = screen->geometry();
-            move(s.x() + (s.width() - width()) / 2, s.y() + (s.height() - height()) / 2);
-        }
-    }
+    CentreOnScreen(*this);
 }
 
 void FrmMain::CmdNext_Click(int16_t index) {
