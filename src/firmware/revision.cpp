@@ -38,37 +38,59 @@ int AnsiByteLength(std::u32string_view text) {
     return n;
 }
 
-int AnsiByteLengthUtf8(std::string_view s) {
-    int n = 0;
+std::u32string DecodeUtf8(std::string_view s) {
+    std::u32string out;
     std::size_t i = 0;
     while (i < s.size()) {
         const auto b = static_cast<unsigned char>(s[i]);
-        std::size_t len = b < 0x80         ? 1
-                          : (b >> 5) == 6  ? 2
-                          : (b >> 4) == 14 ? 3
-                          : (b >> 3) == 30 ? 4
-                                           : 0;
-        if (len == 0 || i + len > s.size()) {
-            n += 2;
-            ++i;
-            continue;
-        }
-        char32_t cp = len == 1 ? b : (b & (0x7F >> len));
-        bool valid = true;
-        for (std::size_t k = 1; k < len; ++k) {
+        const std::size_t len = b < 0x80         ? 1
+                                : (b >> 5) == 6  ? 2
+                                : (b >> 4) == 14 ? 3
+                                : (b >> 3) == 30 ? 4
+                                                 : 0;
+        char32_t cp = len <= 1 ? b : (b & (0x7F >> len));
+        bool valid = len != 0 && i + len <= s.size();
+        for (std::size_t k = 1; valid && k < len; ++k) {
             const auto cont = static_cast<unsigned char>(s[i + k]);
-            if ((cont & 0xC0) != 0x80) valid = false;
+            valid = (cont & 0xC0) == 0x80;
             cp = (cp << 6) | (cont & 0x3F);
         }
         if (!valid) {
-            n += 2;
+            out.push_back(kReplacementChar);
             ++i;
             continue;
         }
-        n += AnsiByteLength(std::u32string_view(&cp, 1));
+        out.push_back(cp);
         i += len;
     }
-    return n;
+    return out;
+}
+
+std::string EncodeUtf8(std::u32string_view text) {
+    std::string out;
+    for (char32_t c : text) {
+        if (c > 0x10FFFF || (c >= 0xD800 && c <= 0xDFFF)) c = kReplacementChar;
+        if (c < 0x80) {
+            out.push_back(static_cast<char>(c));
+        } else if (c < 0x800) {
+            out.push_back(static_cast<char>(0xC0 | (c >> 6)));
+            out.push_back(static_cast<char>(0x80 | (c & 0x3F)));
+        } else if (c < 0x10000) {
+            out.push_back(static_cast<char>(0xE0 | (c >> 12)));
+            out.push_back(static_cast<char>(0x80 | ((c >> 6) & 0x3F)));
+            out.push_back(static_cast<char>(0x80 | (c & 0x3F)));
+        } else {
+            out.push_back(static_cast<char>(0xF0 | (c >> 18)));
+            out.push_back(static_cast<char>(0x80 | ((c >> 12) & 0x3F)));
+            out.push_back(static_cast<char>(0x80 | ((c >> 6) & 0x3F)));
+            out.push_back(static_cast<char>(0x80 | (c & 0x3F)));
+        }
+    }
+    return out;
+}
+
+int AnsiByteLengthUtf8(std::string_view s) {
+    return AnsiByteLength(DecodeUtf8(s));
 }
 
 bool CurrentIsNewerOrEqual(const Rev7& current, const Rev7& selected) {

@@ -1,4 +1,4 @@
-// Revision texts: their numeric value, the display form, and the byte length of names.
+// Revision texts: their numeric value, the display form; the byte length of names and UTF-8.
 #pragma once
 
 #include <string>
@@ -25,6 +25,11 @@ std::string StripFillers(std::string_view text);
 int AnsiByteLength(std::u32string_view text);
 // The same for UTF-8 text such as a file name; a byte that is not valid UTF-8 counts 2.
 int AnsiByteLengthUtf8(std::string_view utf8);
+
+// UTF-8 and code points; a byte that is not valid UTF-8 becomes U+FFFD.
+inline constexpr char32_t kReplacementChar = 0xFFFD;
+std::u32string DecodeUtf8(std::string_view utf8);
+std::string EncodeUtf8(std::u32string_view text);
 
 // The warning before a download: the instrument's revision is newer than or equal to the file's.
 bool CurrentIsNewerOrEqual(const Rev7& current, const Rev7& selected);

@@ -32,22 +32,39 @@ inline std::string NotADownloadFile() {
 }
 
 struct WizardRig {
-    explicit WizardRig(InstrumentOptions options = {}, bool withInstrument = true,
-                       std::function<QStringList()> families = {})
+    // The screen's fonts: its families, and the family it draws for a name.
+    struct Fonts {
+        std::function<QStringList()> families;
+        std::function<QString(const QString&)> drawn;
+    };
+
+    explicit WizardRig(InstrumentOptions options = {}, bool withInstrument = true, Fonts fonts = {})
         : world(std::move(options), withInstrument) {
         world.port.setPortOpen(false);
         window = std::make_unique<ui::FrmMain>(ui::WizardParts{
-            world.app, texts, world.script, world.port, world.timer1, world.engine, world.file,
-            dialogs, folder.path(), std::move(families),
-            [](int16_t n) { return "/dev/ttyUSB" + std::to_string(n - 1) + " - test adapter"; },
-            [this] {
-                ++ended;
-                portOpenAtEnd = world.port.portOpen();
-            },
-            [this] {
-                ++chooserShown;
-                if (onChooser) onChooser();
-            }});
+            .app = world.app,
+            .texts = texts,
+            .script = world.script,
+            .port = world.port,
+            .timer1 = world.timer1,
+            .engine = world.engine,
+            .file = world.file,
+            .dialogs = dialogs,
+            .programFolder = folder.path(),
+            .fontFamilies = std::move(fonts.families),
+            .drawnFamily = std::move(fonts.drawn),
+            .describePort =
+                [](int16_t n) { return "/dev/ttyUSB" + std::to_string(n - 1) + " - test adapter"; },
+            .endProcess =
+                [this] {
+                    ++ended;
+                    portOpenAtEnd = world.port.portOpen();
+                },
+            .showFileChooser =
+                [this] {
+                    ++chooserShown;
+                    if (onChooser) onChooser();
+                }});
         window->Form_Load();
         InitDefaults(world.app, world.port, folder.path());
         window->show();

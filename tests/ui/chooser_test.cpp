@@ -2,6 +2,8 @@
 // check of a file, "&Open" and "&Cancel", reopening, and its recovery from a lost folder.
 #include <gtest/gtest.h>
 
+#include <QClipboard>
+#include <QDir>
 #include <QPushButton>
 
 #include "support/chooser_rig.h"
@@ -66,49 +68,72 @@ TEST(Chooser_List, NamesPatternAndLength) {
     EXPECT_EQ(r.listed(), QStringList({"A.HEX"}));
 }
 
+// Keys go to the focus widget as a keyboard sends them; paste takes the same rules.
 TEST(Chooser_Keys, NameAndTypeBoxFilters) {
     struct Case {
         const char* name;
         bool typeBox;
         QString start;
-        std::vector<std::pair<Qt::Key, QString>> keys;  // key and its text
+        QString typed;  // "\b" is Backspace
+        QString pasted;
         QString result;
     };
-    auto typed = [](const char* text) {
-        std::vector<std::pair<Qt::Key, QString>> keys;
-        for (const char* p = text; *p; ++p) keys.emplace_back(Qt::Key_unknown, QString(QChar(*p)));
-        return keys;
-    };
     const Case cases[] = {
-        {"lower case shows upper", false, "", typed("a.hex"), "A.HEX"},
-        {"refused characters", false, "", typed("a* /:\\b"), "AB"},
-        {"underscores and digits", false, "", typed("f_1.hex"), "F_1.HEX"},
-        {"type box takes a star", true, "", typed("*.h"), "*.H"},
-        {"type box refuses blanks and separators", true, "", typed("* /:\\x"), "*X"},
-        {"type box stops at 12 bytes", true, "", typed("ABCDEFGHIJKLMN"), "ABCDEFGHIJKL"},
-        {"underscores do not count", true, "", typed("A_B_C_DEFGHIJKLMNO"), "A_B_C_DEFGHIJKL"},
-        {"backspace at the limit",
-         true,
-         "ABCDEFGHIJKL",
-         {{Qt::Key_Backspace, ""}, {Qt::Key_unknown, "Z"}},
-         "ABCDEFGHIJKZ"},
+        {"lower case shows upper", false, "", "a.hex", "", "A.HEX"},
+        {"refused characters", false, "", "a* /:\\b", "", "AB"},
+        {"underscores and digits", false, "", "f_1.hex", "", "F_1.HEX"},
+        {"paste as typed", false, "", "", "a b*.hex", "AB.HEX"},
+        {"type box takes a star", true, "", "*.h", "", "*.H"},
+        {"type box upper-cases, refuses a space", true, "", "s* x", "", "S*X"},
+        {"type box refuses separators", true, "", "* /:\\x", "", "*X"},
+        {"type box stops at 12 bytes", true, "", "ABCDEFGHIJKLMN", "", "ABCDEFGHIJKL"},
+        {"underscores do not count", true, "", "A_B_C_DEFGHIJKLMNO", "", "A_B_C_DEFGHIJKL"},
+        {"backspace at the limit", true, "ABCDEFGHIJKL", "\bz", "", "ABCDEFGHIJKZ"},
+        {"paste into the type box as typed", true, "", "", "a b/c:d\\efghijklmnop", "ABCDEFGHIJKL"},
     };
     for (const Case& c : cases) {
         SCOPED_TRACE(c.name);
         ChooserRig r;
         auto& ch = r.open();
-        QLineEdit* box = c.typeBox ? ch.RetFile->lineEdit() : ch.FileName;
-        box->setText(c.start);
-        box->end(false);
-        for (const auto& [key, text] : c.keys) {
-            if (key == Qt::Key_Backspace) {
-                QTest::keyClick(box, Qt::Key_Backspace);
+        QWidget* box = c.typeBox ? static_cast<QWidget*>(ch.RetFile) : ch.FileName;
+        QLineEdit* text = c.typeBox ? ch.RetFile->lineEdit() : ch.FileName;
+        text->setText(c.start);
+        box->setFocus(Qt::MouseFocusReason);
+        text->end(false);
+        for (const QChar k : c.typed) {
+            if (k == '\b') {
+                r.key(Qt::Key_Backspace);
             } else {
-                QTest::keyClick(box, text[0].toLatin1());
+                QTest::keyClick(QApplication::focusWidget(), k.toLatin1());
             }
         }
-        EXPECT_EQ(box->text(), c.result);
+        if (!c.pasted.isEmpty()) {
+            QApplication::clipboard()->setText(c.pasted);
+            r.key(Qt::Key_V, Qt::ControlModifier);
+        }
+        EXPECT_EQ(text->text(), c.result);
     }
+}
+
+// The pattern typed into the type box and Enter: the list shows that pattern's files, the name
+// box and the new revision are cleared.
+TEST(Chooser_Keys, TypedPatternAndEnterRefillsTheList) {
+    ChooserRig r;
+    r.folder.write("HEX/A.HEX", DownloadFile("A.02.00"));
+    r.folder.write("HEX/notes.txt", std::string("x"));
+    auto& c = r.open();
+    r.pick("A.HEX");
+    ASSERT_EQ(c.FirmRev2->text(), "A.02.00");
+    c.RetFile->lineEdit()->clear();
+    r.type(c.RetFile, "*.txt");
+    r.key(Qt::Key_Return);
+    EXPECT_EQ(c.RetFile->currentText(), "*.TXT");
+    EXPECT_EQ(r.listed(), QStringList({"NOTES.TXT"}));
+    EXPECT_EQ(c.FileName->text(), "");
+    EXPECT_EQ(c.FirmRev2->text(), "");
+    EXPECT_FALSE(c.OpenCom->isEnabled());
+    EXPECT_EQ(c.RetFile->count(), 2);  // the typed pattern is no new item
+    EXPECT_TRUE(c.isVisible());        // and Enter pressed no button
 }
 
 TEST(Chooser_Check, EnterChecksAndASecondEnterOpens) {
@@ -118,20 +143,21 @@ TEST(Chooser_Check, EnterChecksAndASecondEnterOpens) {
     // Enter in an empty box: nothing to check, "&Open" off.
     c.OpenCom->setEnabled(true);
     c.FirmRev2->setText("X");
-    QTest::keyClick(c.FileName, Qt::Key_Return);
+    c.FileName->setFocus(Qt::MouseFocusReason);
+    r.key(Qt::Key_Return);
     EXPECT_FALSE(c.OpenCom->isEnabled());
     EXPECT_EQ(c.FirmRev2->text(), "");
     EXPECT_EQ(r.app.NewRevision.str(), "       ");
     EXPECT_TRUE(c.isVisible());
     // A name typed in lower case is shown in upper case and opens the real file.
-    QTest::keyClicks(c.FileName, "a.hex");
-    QTest::keyClick(c.FileName, Qt::Key_Return);
+    r.type(c.FileName, "a.hex");
+    r.key(Qt::Key_Return);
     EXPECT_TRUE(c.isVisible());  // Enter only checks
     EXPECT_EQ(c.FirmRev2->text(), "A.02.00");
     EXPECT_TRUE(c.OpenCom->isEnabled());
     EXPECT_EQ(c.focusWidget(), c.OpenCom);
     EXPECT_TRUE(r.dialogs.shown.empty());
-    QTest::keyClick(c.OpenCom, Qt::Key_Return);
+    r.key(Qt::Key_Return);
     EXPECT_FALSE(c.isVisible());
     EXPECT_EQ(c.result(), QDialog::Accepted);
     EXPECT_EQ(r.app.FilePath, r.hex() + "/a.hex");
@@ -198,8 +224,8 @@ TEST(Chooser_Check, FirmRevInfoOutcomes) {
         }
         auto& ch = r.open();
         r.dialogs.answers = c.answers;
-        QTest::keyClicks(ch.FileName, "f.hex");
-        QTest::keyClick(ch.FileName, Qt::Key_Return);
+        r.type(ch.FileName, "f.hex");
+        r.key(Qt::Key_Return);
         EXPECT_EQ(r.dialogs.shown, c.shown);
         EXPECT_EQ(ch.OpenCom->isEnabled(), c.accepted);
         EXPECT_EQ(ch.FirmRev2->text(), c.accepted ? QString::fromStdString(c.file) : "");
@@ -297,9 +323,13 @@ TEST(Chooser_Recovery, FolderGoneWhileOpen) {
     ASSERT_NE(item, nullptr);
     std::filesystem::remove(sub);
     c.dirlist->setCurrentItem(item);
-    QTest::keyClick(c.dirlist, Qt::Key_Return);
+    c.dirlist->setFocus(Qt::MouseFocusReason);
+    r.key(Qt::Key_Return);
     EXPECT_EQ(r.dialogs.shown, (std::vector<Shown>{{"critical", "Could not read file."}}));
     EXPECT_EQ(c.dirlist->path(), r.hex());
+    // The folder shown is the one highlighted again.
+    ASSERT_NE(c.dirlist->currentItem(), nullptr);
+    EXPECT_EQ(c.dirlist->currentItem()->text().trimmed(), "HEX");
     // Entering a folder that is there lists it.
     std::filesystem::create_directory(sub);
     r.folder.write("HEX/sub/IN.HEX", std::string("x"));

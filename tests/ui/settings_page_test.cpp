@@ -2,6 +2,9 @@
 // Preset, and the choice applied to the port.
 #include <gtest/gtest.h>
 
+#include <QApplication>
+#include <QLineEdit>
+
 #include "support/wizard_rig.h"
 
 namespace zx917 {
@@ -159,6 +162,39 @@ TEST(Settings_Apply, TheChoiceReachesThePort) {
         EXPECT_EQ(r.world.port.sent.front().text(), "*IDN?" + c.terminator);
         EXPECT_EQ(r.world.port.sent.front().settings, c.settings);
     }
+}
+
+// Real keys go to the focus widget: a speed typed and Enter is used, not added to the list;
+// Enter presses Preset; the port's tooltip follows the port chosen by keys.
+TEST(Settings_Keys, TypedSpeedEnterPresetAndPortTooltip) {
+    WizardRig r;
+    r.w().activateWindow();
+    QApplication::setActiveWindow(&r.w());
+    ASSERT_TRUE(QTest::qWaitForWindowActive(&r.w()));
+    r.click(r.w().CmdNext[0]);
+    ASSERT_EQ(r.page(), 1);
+    auto& s = *r.w().settings;
+    auto keys = [](QWidget* w, const std::vector<int>& ks) {
+        w->setFocus(Qt::TabFocusReason);
+        for (int k : ks) QTest::keyClick(QApplication::focusWidget(), static_cast<Qt::Key>(k));
+    };
+    EXPECT_TRUE(s.cboPort->toolTip().contains("/dev/ttyUSB0"))
+        << s.cboPort->toolTip().toStdString();
+    keys(s.cboPort, {Qt::Key_Down});
+    ASSERT_EQ(s.cboPort->currentText(), "Com2");
+    EXPECT_TRUE(s.cboPort->toolTip().contains("/dev/ttyUSB1"))
+        << s.cboPort->toolTip().toStdString();
+
+    keys(s.cboSpeed, {});
+    s.cboSpeed->lineEdit()->selectAll();
+    keys(s.cboSpeed, {Qt::Key_4, Qt::Key_8, Qt::Key_0, Qt::Key_0, Qt::Key_Return});
+    EXPECT_EQ(items(s.cboSpeed), QStringList({"9600", "19200"}));
+    EXPECT_EQ(s.cboSpeed->currentText(), "4800");
+    ui::SetListText(s.cboDataBits, "7");
+    keys(s.cmdReset, {Qt::Key_Return});
+    EXPECT_EQ(s.cboSpeed->currentText(), "9600");
+    EXPECT_EQ(s.cboDataBits->currentText(), "8");
+    EXPECT_EQ(r.page(), 1);
 }
 
 // While the instrument is asked for its revision, nothing on page 1 but help takes a click.

@@ -4,10 +4,13 @@
 
 #include <QAbstractButton>
 #include <QApplication>
+#include <QFontInfo>
 #include <QGroupBox>
 #include <QLabel>
+#include <QPushButton>
 
 #include "support/wizard_rig.h"
+#include "ui/common/centre.h"
 #include "ui/common/twips.h"
 
 namespace zx917 {
@@ -244,23 +247,65 @@ TEST(Wizard_Pages, TabCyclesThroughTheShownPageOnly) {
     EXPECT_EQ(focused(), "CmdExit_2");
 }
 
+// Enter on a focused button presses it, as Space does, on every page.
+TEST(Wizard_Pages, EnterPressesEveryButton) {
+    WizardRig probe;
+    std::vector<std::pair<int, QString>> buttons;  // page and name
+    for (int n = 0; n < ui::kPages; ++n) {
+        for (QPushButton* b : probe.w().Picture4[n]->findChildren<QPushButton*>())
+            buttons.emplace_back(n, b->objectName());
+    }
+    ASSERT_EQ(buttons.size(), 18u);
+    for (const auto& [page, name] : buttons) {
+        SCOPED_TRACE(name.toStdString());
+        WizardRig r;
+        r.w().activateWindow();
+        QApplication::setActiveWindow(&r.w());
+        ASSERT_TRUE(QTest::qWaitForWindowActive(&r.w()));
+        r.w().GoToPage(page);
+        auto* b = r.w().findChild<QPushButton*>(name);
+        b->setEnabled(true);
+        b->setFocus(Qt::TabFocusReason);
+        ASSERT_EQ(QApplication::focusWidget(), b);
+        int clicks = 0;
+        QObject::connect(b, &QPushButton::clicked, [&clicks] { ++clicks; });
+        QTest::keyClick(QApplication::focusWidget(), Qt::Key_Return);
+        EXPECT_EQ(clicks, 1);
+    }
+}
+
 TEST(Wizard_Pages, RevisionFontFromTheFontList) {
     struct Case {
         const char* name;
         QStringList families;
+        QString drawnForArial;  // the family the system draws for "Arial"
         QString family;
         qreal size;
     };
     const Case cases[] = {
-        {"no Arial", {"DejaVu Sans", "Liberation Sans", "Times"}, "System", 10},
-        {"Arial Black before Arial", {"Courier", "Arial Black", "Arial"}, "Arial Black", 20},
-        {"Arial", {"Arial", "Arial Narrow"}, "Arial", 20},
-        {"case matters", {"arial", "ARIAL"}, "System", 10},
-        {"empty list", {}, "System", 10},
+        {"no Arial", {"DejaVu Sans", "Liberation Sans", "Times"}, "DejaVu Sans", "System", 10},
+        {"Arial Black before Arial",
+         {"Courier", "Arial Black", "Arial"},
+         "Liberation Sans",
+         "Arial Black",
+         20},
+        {"Arial", {"Arial", "Arial Narrow"}, "Arial", "Arial", 20},
+        {"case matters", {"arial", "ARIAL"}, "DejaVu Sans", "System", 10},
+        {"empty list", {}, "DejaVu Sans", "System", 10},
+        // A system without Arial whose fonts stand in for it with the same metrics.
+        {"Liberation Sans serves Arial",
+         {"DejaVu Sans", "Liberation Sans"},
+         "Liberation Sans",
+         "Liberation Sans",
+         20},
+        {"Arimo serves Arial", {"Arimo", "DejaVu Sans"}, "Arimo", "Arimo", 20},
     };
     for (const Case& c : cases) {
         SCOPED_TRACE(c.name);
-        WizardRig r({}, true, [&c] { return c.families; });
+        WizardRig r(
+            {}, true,
+            {.families = [&c] { return c.families; },
+             .drawn = [&c](const QString& f) { return f == "Arial" ? c.drawnForArial : f; }});
         for (int n = 0; n < ui::kPages; ++n) {
             if (r.w().CurFirmInfo[n] == nullptr) continue;
             const bool large = n == 2;
@@ -271,6 +316,77 @@ TEST(Wizard_Pages, RevisionFontFromTheFontList) {
                 EXPECT_EQ(r.w().NewFirmInfo[n]->font().pointSizeF(), c.size);
             }
         }
+    }
+}
+
+// The system's own fonts (fonts-liberation2 is a dependency): the page 2 revisions are large.
+TEST(Wizard_Pages, RevisionLargeWithTheSystemsFonts) {
+    WizardRig r;
+    for (const QLabel* l : {r.w().CurFirmInfo[2], r.w().NewFirmInfo[2]}) {
+        EXPECT_EQ(l->font().pointSizeF(), 20);
+        const QString drawn = QFontInfo(l->font()).family();
+        EXPECT_TRUE(drawn.startsWith("Arial") || drawn == "Liberation Sans" || drawn == "Arimo")
+            << drawn.toStdString();
+    }
+}
+
+// Names that do not fit their box keep both ends, with an ellipsis between them, the brackets
+// clear of them, and the whole name in the tooltip.
+TEST(Wizard_Pages, LongFileNamesElidedInTheMiddle) {
+    const QString names[] = {"GOOD_SMALL.HEX", "WWWWWWWW.HEX", "A_VERY_LONG_FIRMWARE_NAME.HEX",
+                             "NEW.HEX"};
+    for (const QString& full : names) {
+        SCOPED_TRACE(full.toStdString());
+        WizardRig r;
+        ui::SetCaption(r.w().NewFirmFile[2], full);
+        for (int n : {2, 3, 4, 5}) {
+            r.w().GoToPage(n);
+            const ui::NameLabel* l = r.w().NewFirmFile[n];
+            const QString shown = l->text();
+            const QFontMetrics fm(l->font());
+            EXPECT_LE(fm.horizontalAdvance(shown), l->contentsRect().width()) << n;
+            EXPECT_EQ(l->toolTip(), full);
+            EXPECT_EQ(l->name(), full);
+            if (fm.horizontalAdvance(full) <= l->contentsRect().width()) {
+                EXPECT_EQ(shown, full);
+            } else {
+                EXPECT_TRUE(shown.contains(QChar(0x2026))) << shown.toStdString();
+                EXPECT_EQ(shown.front(), full.front());
+                EXPECT_TRUE(shown.endsWith("X")) << shown.toStdString();
+            }
+            // The brackets stand beside the box, not over it.
+            int brackets = 0;
+            for (const QLabel* b :
+                 l->parentWidget()->findChildren<QLabel*>(Qt::FindDirectChildrenOnly)) {
+                if (b->text() != "(" && b->text() != ")") continue;
+                ++brackets;
+                EXPECT_FALSE(l->geometry().intersects(b->geometry()))
+                    << b->objectName().toStdString();
+            }
+            EXPECT_EQ(brackets, 2);
+        }
+    }
+}
+
+TEST(Wizard_Window, CentredButNeverOffTheScreen) {
+    struct Case {
+        const char* name;
+        QRect screen, available;
+        QSize window;
+        QPoint at;
+    };
+    const Case cases[] = {
+        {"fits", {0, 0, 1024, 768}, {0, 0, 1024, 740}, {559, 294}, {232, 237}},
+        {"wider than the screen", {0, 0, 512, 384}, {0, 0, 512, 384}, {559, 294}, {0, 45}},
+        {"taller than the available area",
+         {0, 0, 800, 300},
+         {0, 24, 800, 276},
+         {559, 320},
+         {120, 24}},
+        {"second screen", {1024, 0, 800, 600}, {1024, 0, 800, 600}, {559, 294}, {1144, 153}},
+    };
+    for (const Case& c : cases) {
+        EXPECT_EQ(ui::CentredPosition(c.screen, c.available, c.window), c.at) << c.name;
     }
 }
 

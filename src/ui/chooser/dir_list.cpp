@@ -17,8 +17,7 @@ constexpr const char* kIndent = "  ";
 
 DirList::DirList(QWidget* parent) : QListWidget(parent) {
     connect(this, &QListWidget::itemDoubleClicked, this, [this](QListWidgetItem* item) {
-        const std::string folder = item->data(kPathRole).toByteArray().toStdString();
-        if (!setPath(folder) && onFailure) onFailure();
+        enter(item->data(kPathRole).toByteArray().toStdString());
     });
 }
 
@@ -28,9 +27,19 @@ std::string DirList::highlighted() const {
 }
 
 bool DirList::setPath(const std::string& folder) {
+    return moveTo(folder, true);
+}
+
+void DirList::enter(const std::string& folder) {
+    if (moveTo(folder, false)) return;
+    rebuild();  // the current folder highlighted again: the two lists agree
+    if (onFailure) onFailure();
+}
+
+bool DirList::moveTo(const std::string& folder, bool mustRead) {
     std::error_code ec;
     std::string canonical = std::filesystem::weakly_canonical(folder, ec).string();
-    if (ec || !IsReadableFolder(canonical)) return false;
+    if (ec || !(mustRead ? IsReadableFolder(canonical) : IsFolder(canonical))) return false;
     if (canonical.size() > 1 && canonical.back() == '/') canonical.pop_back();
     const auto volume = VolumeOf(canonical);
     if (!volume) return false;
@@ -77,7 +86,7 @@ void DirList::keyPressEvent(QKeyEvent* event) {
     const bool character = !event->text().isEmpty() && event->text() != "\t";
     if (character) {
         const std::string target = highlighted();
-        if (target != path_ && !setPath(target) && onFailure) onFailure();
+        if (target != path_) enter(target);
     }
     QListWidget::keyPressEvent(event);
 }

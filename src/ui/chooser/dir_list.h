@@ -16,6 +16,10 @@ public:
     // Makes a folder the current one; false (nothing changed) when it cannot be listed. The
     // change handler runs when the path changed.
     bool setPath(const std::string& folder);
+    // The engineer enters a folder: one that exists becomes the current folder even when it
+    // cannot be read, so that the file list (empty then) stands under it. One that is gone
+    // leaves the current folder highlighted and raises the failure.
+    void enter(const std::string& folder);
     // The folder of the highlighted entry.
     std::string highlighted() const;
 
@@ -27,6 +31,7 @@ protected:
     void keyPressEvent(QKeyEvent* event) override;
 
 private:
+    bool moveTo(const std::string& folder, bool mustRead);
     void rebuild();
 
     std::string path_;

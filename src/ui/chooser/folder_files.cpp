@@ -7,6 +7,7 @@
 #include <system_error>
 
 #include "app/identity.h"
+#include "firmware/file_choice.h"
 #include "ui/common/qt_text.h"
 
 namespace zx917::ui {
@@ -34,8 +35,12 @@ std::optional<std::vector<FolderEntry>> list(const std::string& folder, bool fol
 
 }  // namespace
 
-std::optional<std::vector<FolderEntry>> PlainFiles(const std::string& folder) {
-    return list(folder, false);
+std::optional<std::vector<std::string>> PlainFiles(const std::string& folder) {
+    const auto entries = list(folder, false);
+    if (!entries) return std::nullopt;
+    std::vector<std::string> names;
+    for (const FolderEntry& e : *entries) names.push_back(e.name);
+    return names;
 }
 
 std::optional<std::vector<FolderEntry>> Subfolders(const std::string& folder) {
@@ -53,11 +58,14 @@ std::string ResolveFileName(const std::string& folder, const QString& shownName)
     std::error_code ec;
     if (fs::is_regular_file(JoinPath(folder, exact), ec)) return exact;
     if (const auto files = PlainFiles(folder)) {
-        for (const FolderEntry& f : *files) {
-            if (f.shown.compare(shownName, Qt::CaseInsensitive) == 0) return f.name;
-        }
+        if (auto same = SameNameRegardlessOfCase(*files, shownName.toStdString())) return *same;
     }
     return exact;
+}
+
+bool IsFolder(const std::string& path) {
+    std::error_code ec;
+    return !path.empty() && fs::is_directory(path, ec);
 }
 
 bool IsReadableFolder(const std::string& path) {

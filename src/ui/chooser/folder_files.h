@@ -14,9 +14,9 @@ struct FolderEntry {
     QString shown;     // decoded for the screen (names that are not valid text still show)
 };
 
-// The visible plain files of a folder in the order the file system gives them (names beginning
-// with "." are hidden files and left out). Nothing when the folder cannot be listed.
-std::optional<std::vector<FolderEntry>> PlainFiles(const std::string& folder);
+// The names of a folder's visible plain files in the order the file system gives them (names
+// beginning with "." are hidden files and left out). Nothing when the folder cannot be listed.
+std::optional<std::vector<std::string>> PlainFiles(const std::string& folder);
 // The visible subfolders, by name.
 std::optional<std::vector<FolderEntry>> Subfolders(const std::string& folder);
 
@@ -24,6 +24,9 @@ std::optional<std::vector<FolderEntry>> Subfolders(const std::string& folder);
 // name when it exists, else the first name in the folder's order that equals it without regard
 // to case; the name unchanged when nothing matches.
 std::string ResolveFileName(const std::string& folder, const QString& shownName);
+
+// True when the path is a folder, readable or not.
+bool IsFolder(const std::string& path);
 
 // True when the path is a folder that can be listed.
 bool IsReadableFolder(const std::string& path);

@@ -1,14 +1,15 @@
 #include "ui/chooser/frm_new_sel.h"
 
 #include <QDir>
-#include <QKeyEvent>
-#include <QSet>
+#include <QMouseEvent>
 #include <QShortcut>
+#include <utility>
 
 #include "app/identity.h"
 #include "firmware/download_file.h"
+#include "firmware/file_choice.h"
 #include "firmware/revision.h"
-#include "link/wildcard.h"
+#include "ui/chooser/box_validators.h"
 #include "ui/chooser/folder_files.h"
 #include "ui/chooser/volumes.h"
 #include "ui/common/centre.h"
@@ -19,8 +20,7 @@ namespace zx917::ui {
 
 namespace {
 
-constexpr int kDriveRole = Qt::UserRole;
-constexpr int kNameLimitBytes = 12;
+constexpr int kNameRole = Qt::UserRole;  // a file list entry's real name
 
 QLabel* makeLabel(QWidget* parent, const char* name, const char* text, QRect at) {
     auto* l = new QLabel(QString::fromLatin1(text), parent);
@@ -90,13 +90,28 @@ FrmNewSel::FrmNewSel(const ChooserParts& parts, QWidget* owner)
     setTabOrder(RetFile, OpenCom);
     setTabOrder(OpenCom, CanselCom);
 
-    enterClicks_.watch(OpenCom);
-    enterClicks_.watch(CanselCom);
-    FileName->installEventFilter(this);
-    RetFile->lineEdit()->installEventFilter(this);
-    connect(drvlist, &QComboBox::activated, this, [this] { drvlist_Change(); });
+    enterClicks_.watchAll(this);
+    if (!p_.listFiles) p_.listFiles = PlainFiles;
+    // Keys, paste, drop and input methods all reach the boxes through their rules; a real key
+    // for the type box arrives at the list, which hands it to its text box past any filter.
+    FileName->setValidator(new BoxValidator(FileNameText, FileName));
+    RetFile->setValidator(new BoxValidator(RetFileText, RetFile));
+    RetFile->setCompleter(nullptr);
+    connect(FileName, &QLineEdit::returnPressed, this, [this] { FileName_KeyPress(); });
+    connect(FileName, &QLineEdit::textChanged, this, [this] { updateOpen(); });
+    connect(RetFile->lineEdit(), &QLineEdit::returnPressed, this,
+            [this] { RetFile_KeyDown(Qt::Key_Return); });
+    connect(drvlist, &QComboBox::activated, this, [this] {
+        // The list raises this for the drive already shown too; only a new drive changes.
+        if (drvlist->currentData().toByteArray().toStdString() != shownDrive_) drvlist_Change();
+    });
     dirlist->onFailure = [this] { couldNotRead(); };
     connect(File, &QListWidget::itemSelectionChanged, this, [this] { File_Click(); });
+    // A click on the entry already selected checks it again (after a refusal, say).
+    File->viewport()->installEventFilter(this);
+    connect(File, &QListWidget::itemClicked, this, [this] {
+        if (std::exchange(pressedOnSelected_, false)) File_Click();
+    });
     connect(RetFile, &QComboBox::activated, this, [this] { RetFile_Click(); });
     connect(OpenCom, &QPushButton::clicked, this, [this] { OpenCom_Click(); });
     connect(CanselCom, &QPushButton::clicked, this, [this] { CanselCom_Click(); });
@@ -111,7 +126,10 @@ FrmNewSel::FrmNewSel(const ChooserParts& parts, QWidget* owner)
     // The folder list starts at the process's current folder; that is no change of folder.
     dirlist->setPath(ToFileName(QDir::currentPath()));
     showDriveOf(dirlist->path());
-    dirlist->onChange = [this] { dirlist_Change(); };
+    dirlist->onChange = [this] {
+        folderChanged_ = true;
+        dirlist_Change();
+    };
 }
 
 void FrmNewSel::showDriveOf(const std::string& folder) {
@@ -123,6 +141,7 @@ void FrmNewSel::showDriveOf(const std::string& folder) {
         i = drvlist->count() - 1;
     }
     drvlist->setCurrentIndex(i);
+    shownDrive_ = *root;
 }
 
 void FrmNewSel::couldNotRead() {
@@ -130,9 +149,8 @@ void FrmNewSel::couldNotRead() {
 }
 
 // Sets the drive as the load step does: a different drive raises its change.
-bool FrmNewSel::setDrive(const std::string& root) {
-    const std::string shown = drvlist->currentData().toByteArray().toStdString();
-    if (shown == root) return true;
+void FrmNewSel::setDrive(const std::string& root) {
+    if (root == shownDrive_) return;
     int i = drvlist->findData(QByteArray::fromStdString(root));
     if (i < 0) {
         drvlist->addItem(FromFileName(root), QByteArray::fromStdString(root));
@@ -140,7 +158,6 @@ bool FrmNewSel::setDrive(const std::string& root) {
     }
     drvlist->setCurrentIndex(i);
     drvlist_Change();
-    return true;
 }
 
 void FrmNewSel::Form_Load() {
@@ -158,6 +175,7 @@ void FrmNewSel::Form_Load() {
     File->clear();
     bool recovered = false;
     for (;;) {
+        folderChanged_ = false;
         if (loadFolders()) break;
         if (recovered) {  // a second failure ends the load silently
             return;
@@ -170,7 +188,9 @@ void FrmNewSel::Form_Load() {
         p_.app.SelectedRevision = "       ";
         recovered = true;
     }
-    if (p_.app.HexFolder == p_.programFolder) FillFileList();
+    // The folder list may already have stood in the start folder (the process's working
+    // folder): then no change of folder filled the list.
+    if (!folderChanged_) FillFileList();
 }
 
 // Load steps 8 to 10; false on a failure, which the load step recovers from once.
@@ -179,7 +199,12 @@ bool FrmNewSel::loadFolders() {
     if (!root) return false;
     setDrive(*root);
     if (!dirlist->setPath(p_.app.HexFolder)) return false;
-    OpenCom->setEnabled(!StripFillers(p_.app.SelectedRevision.str()).empty());
+    accepted_.reset();
+    if (!StripFillers(p_.app.SelectedRevision.str()).empty()) {
+        accepted_ = Accepted{dirlist->path(), FromFileName(p_.app.SelectedFileName),
+                             p_.app.FilePath, p_.app.SelectedRevision};
+    }
+    updateOpen();
     FirmRev1->setText(FromLatin1(p_.app.CurrentRevision.str()));
     FirmRev2->setText(FromLatin1(p_.app.SelectedRevision.str()));
     return true;
@@ -189,22 +214,12 @@ void FrmNewSel::FillFileList() {
     File->blockSignals(true);
     File->clear();
     File->blockSignals(false);
-    fillFailed_ = false;
-    const auto files = PlainFiles(dirlist->path());
-    if (!files) {
-        fillFailed_ = true;
-        return;
-    }
-    const std::string pattern = ToLatin1(RetFile->currentText());
-    QSet<QString> listed;  // names that differ only in case open one file: listed once
-    for (const FolderEntry& f : *files) {
-        const QString upper = f.shown.toUpper();
-        if (listed.contains(upper)) continue;
-        if (WildcardMatch(upper.toStdString(), pattern) &&
-            AnsiByteLengthUtf8(f.name) <= kNameLimitBytes) {
-            File->addItem(upper);
-            listed.insert(upper);
-        }
+    const auto names = p_.listFiles(dirlist->path());
+    fillFailed_ = !names;
+    if (!names) return;
+    for (const ListedName& n : ListedFileNames(*names, RetFile->currentText().toStdString())) {
+        auto* entry = new QListWidgetItem(QString::fromStdString(n.shown), File);
+        entry->setData(kNameRole, QByteArray::fromStdString(n.name));
     }
 }
 
@@ -219,6 +234,7 @@ void FrmNewSel::drvlist_Change() {
 }
 
 void FrmNewSel::dirlist_Change() {
+    updateOpen();
     FillFileList();
     if (fillFailed_) {
         couldNotRead();
@@ -229,42 +245,32 @@ void FrmNewSel::dirlist_Change() {
 void FrmNewSel::File_Click() {
     const QListWidgetItem* item = File->currentItem();
     if (item == nullptr || !item->isSelected()) return;
-    FileName->setText(item->text().toUpper());
-    FirmRevInfo(joinCurrent(item->text()));
+    FileName->setText(item->text());
+    FirmRevInfo(JoinPath(dirlist->path(), RealName(*item)));
+}
+
+std::string FrmNewSel::RealName(const QListWidgetItem& entry) {
+    return entry.data(kNameRole).toByteArray().toStdString();
 }
 
 std::string FrmNewSel::joinCurrent(const QString& shownName) const {
     return JoinPath(dirlist->path(), ResolveFileName(dirlist->path(), shownName));
 }
 
-bool FrmNewSel::FileName_KeyPress(QChar& key) {
-    key = key.toUpper();
-    if (key == '*' || key == ' ' || key == '/' || key == ':' || key == '\\') return false;
-    if (key == QChar(13)) {
-        if (FileName->text().isEmpty()) {
-            FirmRev2->clear();
-            p_.app.NewRevision = "       ";
-            OpenCom->setEnabled(false);
-        } else {
-            FirmRevInfo(joinCurrent(FileName->text()));
-        }
+void FrmNewSel::FileName_KeyPress() {
+    if (FileName->text().isEmpty()) {
+        FirmRev2->clear();
+        p_.app.NewRevision = "       ";
+        accepted_.reset();
+        updateOpen();
+    } else {
+        FirmRevInfo(joinCurrent(FileName->text()));
     }
-    return true;
 }
 
 void FrmNewSel::RetFile_Click() {
     FillFileList();
     if (fillFailed_) couldNotRead();  // a folder gone meanwhile: say so rather than fail
-}
-
-bool FrmNewSel::RetFile_KeyPress(QChar& key) {
-    key = key.toUpper();
-    if (key == ' ' || key == '/' || key == ':' || key == '\\') return false;
-    if (key != QChar(8)) {
-        const std::string before = ToFileName(RetFile->currentText());
-        if (AnsiByteLengthUtf8(StripFillers(before)) >= kNameLimitBytes) return false;
-    }
-    return true;
 }
 
 void FrmNewSel::RetFile_KeyDown(int key) {
@@ -275,11 +281,11 @@ void FrmNewSel::RetFile_KeyDown(int key) {
 }
 
 void FrmNewSel::OpenCom_Click() {
-    const QString name = FileName->text();
-    p_.app.FilePath = joinCurrent(name);
-    p_.app.SelectedFileName = ToFileName(name);
-    p_.app.HexFolder = dirlist->path();
-    p_.app.SelectedRevision = p_.app.NewRevision;
+    if (!OpenCom->isEnabled() || !accepted_) return;
+    p_.app.FilePath = accepted_->path;
+    p_.app.SelectedFileName = ToFileName(accepted_->name);
+    p_.app.HexFolder = accepted_->folder;
+    p_.app.SelectedRevision = accepted_->revision;
     accept();
 }
 
@@ -289,40 +295,31 @@ void FrmNewSel::CanselCom_Click() {
 
 void FrmNewSel::FirmRevInfo(const std::string& path) {
     if (CheckDownloadFile({p_.app, p_.file, p_.dialogs, p_.texts}, path, 1)) {
+        accepted_ = Accepted{dirlist->path(), FileName->text(), path, p_.app.NewRevision};
         FirmRev2->setText(FromLatin1(StripFillers(p_.app.NewRevision.str())));
-        OpenCom->setEnabled(true);
+        updateOpen();
         OpenCom->setFocus();
     } else {
-        OpenCom->setEnabled(false);
+        accepted_.reset();
         FileName->clear();
         FirmRev2->clear();
+        updateOpen();
     }
 }
 
-// The key filters of the name and type boxes, in the order the keys come.
+void FrmNewSel::updateOpen() {
+    OpenCom->setEnabled(accepted_ && accepted_->folder == dirlist->path() &&
+                        accepted_->name == FileName->text());
+}
+
+// Notes whether a press on the file list lands on the entry already selected.
 bool FrmNewSel::eventFilter(QObject* watched, QEvent* event) {
-    if (event->type() != QEvent::KeyPress) return QDialog::eventFilter(watched, event);
-    auto* key = static_cast<QKeyEvent*>(event);
-    const bool enter = key->key() == Qt::Key_Return || key->key() == Qt::Key_Enter;
-    const bool backspace = key->key() == Qt::Key_Backspace;
-    QString text = key->text();
-    if (enter) text = QChar(13);
-    if (backspace) text = QChar(8);
-    if (watched == RetFile->lineEdit() && enter) {
-        RetFile_KeyDown(key->key());
-        return true;
+    if (watched == File->viewport() && event->type() == QEvent::MouseButtonPress) {
+        const auto* press = static_cast<QMouseEvent*>(event);
+        const QListWidgetItem* at = File->itemAt(press->position().toPoint());
+        pressedOnSelected_ = at != nullptr && at->isSelected();
     }
-    if (text.size() != 1 || (!enter && !backspace && !text[0].isPrint())) {
-        return QDialog::eventFilter(watched, event);  // arrows, Tab, shortcuts
-    }
-    QChar c = text[0];
-    QLineEdit* box = watched == FileName ? FileName : RetFile->lineEdit();
-    const bool pass = watched == FileName ? FileName_KeyPress(c) : RetFile_KeyPress(c);
-    if (!pass) return true;
-    if (enter) return true;  // handled; no button presses it
-    if (backspace) return false;
-    box->insert(QString(c));
-    return true;
+    return QDialog::eventFilter(watched, event);
 }
 
 }  // namespace zx917::ui

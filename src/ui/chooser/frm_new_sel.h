@@ -11,7 +11,9 @@
 #include <QListWidget>
 #include <QPushButton>
 #include <functional>
+#include <optional>
 #include <string>
+#include <vector>
 
 #include "app/app_state.h"
 #include "app/dialogs.h"
@@ -29,6 +31,9 @@ struct ChooserParts {
     Dialogs& dialogs;
     std::string programFolder;
     std::function<void(int32_t context)> showHelp;  // F1
+    // The names of a folder's plain files; nothing when it cannot be listed. PlainFiles when
+    // empty; a test stands in a folder that refuses to be read.
+    std::function<std::optional<std::vector<std::string>>(const std::string& folder)> listFiles;
 };
 
 inline constexpr int32_t kChooserHelpContext = 21;
@@ -42,9 +47,10 @@ public:
     void drvlist_Change();
     void dirlist_Change();
     void File_Click();
-    // Key handlers: the character typed; false when the key is cancelled.
-    bool FileName_KeyPress(QChar& key);
-    bool RetFile_KeyPress(QChar& key);
+    // Enter in the name box. Typed characters reach the box through its validator, which
+    // upper-cases them and refuses "*", " ", "/", ":" and "\".
+    void FileName_KeyPress();
+    // Enter in the type box; its validator applies the type box's own key rule.
     void RetFile_KeyDown(int key);
     void RetFile_Click();
     void OpenCom_Click();
@@ -53,6 +59,8 @@ public:
 
     // The current folder joined with a name shown in the lists (the real file's path).
     std::string joinCurrent(const QString& shownName) const;
+    // The real name behind a file list entry.
+    static std::string RealName(const QListWidgetItem& entry);
 
     QLabel* Label1;
     QComboBox* drvlist;
@@ -72,15 +80,30 @@ protected:
     bool eventFilter(QObject* watched, QEvent* event) override;
 
 private:
+    // The file that the last check accepted, or the choice the chooser opened with: "&Open"
+    // commits exactly this file with its revision, and only while the current folder and the
+    // name box still name it.
+    struct Accepted {
+        std::string folder;
+        QString name;
+        std::string path;
+        Rev7 revision;
+    };
+
     bool loadFolders();
     // Shows the volume of a folder in the drive list without raising its change.
     void showDriveOf(const std::string& folder);
     void couldNotRead();
-    bool setDrive(const std::string& root);
+    void setDrive(const std::string& root);
+    void updateOpen();
 
     ChooserParts p_;
     EnterClicks enterClicks_;
     bool fillFailed_ = false;
+    bool folderChanged_ = false;  // the folder change handler ran (load step 8)
+    std::string shownDrive_;      // the volume the drive list shows
+    bool pressedOnSelected_ = false;
+    std::optional<Accepted> accepted_;
 };
 
 }  // namespace zx917::ui

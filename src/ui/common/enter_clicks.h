@@ -6,6 +6,7 @@
 #include <QEvent>
 #include <QKeyEvent>
 #include <QObject>
+#include <QPushButton>
 
 namespace zx917::ui {
 
@@ -14,6 +15,10 @@ public:
     using QObject::QObject;
 
     void watch(QAbstractButton* button) { button->installEventFilter(this); }
+    // Every push button of a window, so that none is left out.
+    void watchAll(QWidget* window) {
+        for (QPushButton* b : window->findChildren<QPushButton*>()) watch(b);
+    }
 
 protected:
     bool eventFilter(QObject* watched, QEvent* event) override {

@@ -74,6 +74,7 @@ SettingsPage::SettingsPage(QWidget* page, const SettingsParts& parts) : p_(parts
     Frame3->setGeometry(twips(3960, 720, 3375, 3015));
     makeLabel(Frame3, "Label1_1", "Baud Rate:", 480, 360);
     cboSpeed = makeList(Frame3, "cboSpeed", 1800, 360, true);
+    cboSpeed->setInsertPolicy(QComboBox::NoInsert);  // a typed rate is used, not listed
     makeLabel(Frame3, "Label2_1", "Data Length:", 360, 720);
     cboDataBits = makeList(Frame3, "cboDataBits", 1800, 720);
     makeLabel(Frame3, "Label9_1", "Stop Bits:", 600, 1080);
@@ -88,6 +89,10 @@ SettingsPage::SettingsPage(QWidget* page, const SettingsParts& parts) : p_(parts
     cmdReset->setObjectName("cmdReset");
     cmdReset->setGeometry(twips(1800, 2520, 1215, 375));
     QObject::connect(cmdReset, &QPushButton::clicked, [this] { cmdReset_Click(); });
+    // The tooltip names the device of the port chosen.
+    QObject::connect(cboPort, &QComboBox::currentIndexChanged, [this](int i) {
+        cboPort->setToolTip(cboPort->itemData(i, Qt::ToolTipRole).toString());
+    });
 }
 
 std::vector<QWidget*> SettingsPage::tabStops() const {
@@ -127,7 +132,7 @@ bool SettingsPage::ProtSettings() {
         return false;
     }
     port.setCommPort(chosen);
-    cboPort->setToolTip(cboPort->itemData(cboPort->currentIndex(), Qt::ToolTipRole).toString());
+    cboPort->setToolTip(cboPort->itemData(selected, Qt::ToolTipRole).toString());
     fill(cboSpeed, {"9600", "19200"});
     fill(cboDataBits, {"7", "8"});
     fill(cboParity, {"Even", "Odd", "None"});

@@ -25,6 +25,7 @@
 #include "link/command_script.h"
 #include "link/engine.h"
 #include "ui/common/enter_clicks.h"
+#include "ui/common/name_label.h"
 #include "ui/settings/settings_page.h"
 #include "ui/wizard/clip_player.h"
 #include "ui/wizard/help_viewer.h"
@@ -45,6 +46,8 @@ struct WizardParts {
     std::string programFolder;
     // The screen's font names in the platform's order (REV_Font); the system's when empty.
     std::function<QStringList()> fontFamilies;
+    // The family the system draws for a font name (QFontInfo) when empty.
+    std::function<QString(const QString&)> drawnFamily;
     // Device path and description of "Com<n>", for the settings page.
     std::function<std::string(int16_t)> describePort;
     // Ends the process at once; closing the window calls it from wherever the program waits.
@@ -103,7 +106,7 @@ public:
     std::array<QPushButton*, kPages> CmdBack{};
     std::array<QLabel*, kPages> CurFirmInfo{};
     std::array<QLabel*, kPages> NewFirmInfo{};
-    std::array<QLabel*, kPages> NewFirmFile{};
+    std::array<NameLabel*, kPages> NewFirmFile{};
     std::array<QLabel*, kPages> RemTime{};
     QLabel* RedByte4 = nullptr;
     QProgressBar* ProgressBar = nullptr;
@@ -139,7 +142,8 @@ private:
     std::optional<QString> pendingRemaining_;
 };
 
-// Sets a label's caption; a label designed to size itself to its text does so.
+// Sets a label's caption; a label designed to size itself to its text does so, a label that
+// shows a name elides it.
 void SetCaption(QLabel* label, const QString& text);
 
 }  // namespace zx917::ui

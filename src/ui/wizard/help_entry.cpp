@@ -20,8 +20,13 @@ void FrmMain::CmdFirmSelect_Click() {
         p_.showFileChooser();
     } else {
         // Loaded for this use and unloaded when the engineer has left it.
-        FrmNewSel chooser(ChooserParts{p_.app, p_.texts, p_.file, p_.dialogs, p_.programFolder,
-                                       [this](int32_t c) { help_.show(helpFile_, c); }},
+        FrmNewSel chooser(ChooserParts{.app = p_.app,
+                                       .texts = p_.texts,
+                                       .file = p_.file,
+                                       .dialogs = p_.dialogs,
+                                       .programFolder = p_.programFolder,
+                                       .showHelp = [this](int32_t c) { help_.show(helpFile_, c); },
+                                       .listFiles = {}},
                           this);
         chooser.Form_Load();
         chooser.exec();

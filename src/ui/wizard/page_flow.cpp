@@ -31,6 +31,7 @@ FrmMain::FrmMain(const WizardParts& parts)
     design.setBold(true);
     setFont(design);
     buildPages();
+    enterClicks_.watchAll(this);
     progressTimer_.setSingleShot(true);
     connect(&progressTimer_, &QTimer::timeout, this, [this] { showProgressNow(); });
     auto* f1 = new QShortcut(QKeySequence(Qt::Key_F1), this);

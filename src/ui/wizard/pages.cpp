@@ -1,6 +1,7 @@
 // The pages as designed: every control with its name, caption and place in twips, the page
 // procedures, the tab order and the revision font.
 #include <QFontDatabase>
+#include <QFontInfo>
 #include <QPainter>
 
 #include "ui/common/twips.h"
@@ -32,9 +33,10 @@ QString name(const char* base, int index) {
     return QString::fromLatin1(base) + "_" + QString::number(index);
 }
 
-QLabel* label(QWidget* parent, const QString& objectName, const QString& text, int left, int top,
-              int width = 0, int height = 0, Qt::Alignment align = Qt::AlignLeft) {
-    auto* l = new QLabel(text, parent);
+template <typename Label = QLabel>
+Label* label(QWidget* parent, const QString& objectName, const QString& text, int left, int top,
+             int width = 0, int height = 0, Qt::Alignment align = Qt::AlignLeft) {
+    auto* l = new Label(text, parent);
     l->setObjectName(objectName);
     l->setTextFormat(Qt::PlainText);
     l->setAlignment(align | Qt::AlignTop);
@@ -91,6 +93,7 @@ constexpr Summary kSummary[kPages] = {
 }  // namespace
 
 void SetCaption(QLabel* label, const QString& text) {
+    if (auto* name = dynamic_cast<NameLabel*>(label)) return name->setName(text);
     label->setText(text);
     if (label->property("autoSize").toBool()) label->adjustSize();
 }
@@ -125,7 +128,9 @@ void FrmMain::buildPages() {
     connect(CmdFirmSelect, &QPushButton::clicked, this, [this] { CmdFirmSelect_Click(); });
     NewFirmInfo[2] = label(Frame2, "NewFirmInfo_2", "", 3240, 600, 1812, 612, Qt::AlignHCenter);
     label(Frame2, "Label5_9", "(", 5160, 720);
-    NewFirmFile[2] = label(Frame2, "NewFirmFile_2", "", 5280, 720, 1572, 252, Qt::AlignHCenter);
+    NewFirmFile[2] =
+        label<NameLabel>(Frame2, "NewFirmFile_2", "", 5280, 720, 1572, 252, Qt::AlignHCenter);
+    NewFirmFile[2]->setWordWrap(false);
     label(Frame2, "Label5_8", ")", 6960, 720);
     QFont large("Times New Roman");
     large.setPointSizeF(20.4);
@@ -166,7 +171,6 @@ void FrmMain::buildPages() {
 void FrmMain::buildButtonRow(int n) {
     QWidget* page = Picture4[n];
     auto connectSet = [this](QPushButton* b, void (FrmMain::*handler)(int16_t), int index) {
-        enterClicks_.watch(b);
         connect(b, &QPushButton::clicked, this,
                 [this, handler, index] { (this->*handler)(static_cast<int16_t>(index)); });
     };
@@ -199,8 +203,8 @@ void FrmMain::buildSummary(int n) {
     label(page, name("Label2", s.captionIndex), "New Firmware", 360, s.newCaptionTop);
     NewFirmInfo[n] = label(page, name("NewFirmInfo", n), "", 2640, s.newTop);
     label(page, name("Label5", s.openIndex), "(", 3720, 1100);
-    NewFirmFile[n] =
-        label(page, name("NewFirmFile", n), "", 3840, 1080, s.fileWidth, 255, Qt::AlignHCenter);
+    NewFirmFile[n] = label<NameLabel>(page, name("NewFirmFile", n), "", 3840, 1080, s.fileWidth,
+                                      255, Qt::AlignHCenter);
     NewFirmFile[n]->setWordWrap(false);
     label(page, name("Label5", s.closeIndex), ")", s.closeBracket, 1080);
 }
@@ -233,7 +237,7 @@ void FrmMain::SetPage(int n, bool show) {
         if (n == 4) SetCaption(RemTime[4], RemTime[2]->text());
         SetCaption(CurFirmInfo[n], CurFirmInfo[2]->text());
         SetCaption(NewFirmInfo[n], NewFirmInfo[2]->text());
-        SetCaption(NewFirmFile[n], NewFirmFile[2]->text());
+        NewFirmFile[n]->setName(NewFirmFile[2]->name());
     }
     for (QWidget* w : pageTabStops(n)) w->setFocusPolicy(show ? Qt::StrongFocus : Qt::NoFocus);
     if (show && n == 0 && p_.port.portOpen()) p_.port.setPortOpen(false);
@@ -276,6 +280,11 @@ void FrmMain::SetTabOrder() {
     }
 }
 
+// Arial's metric-compatible stand-ins, which a system without Arial serves for "Arial".
+bool IsArialSubstitute(const QString& family) {
+    return family == "Liberation Sans" || family == "Arimo";
+}
+
 void FrmMain::REV_Font() {
     QString family = "System";
     qreal size = 10;
@@ -285,6 +294,15 @@ void FrmMain::REV_Font() {
             family = f;
             size = 20;
             break;
+        }
+    }
+    if (size != 20) {
+        // No family is named Arial, but the system may draw "Arial" with its stand-in.
+        const QString drawn =
+            p_.drawnFamily ? p_.drawnFamily("Arial") : QFontInfo(QFont("Arial")).family();
+        if (IsArialSubstitute(drawn)) {
+            family = drawn;
+            size = 20;
         }
     }
     for (QLabel* l : {CurFirmInfo[2], NewFirmInfo[2]}) {

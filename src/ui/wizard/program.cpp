@@ -40,10 +40,20 @@ Program::Program(const ProgramOptions& o)
         std::fflush(nullptr);
         ::_exit(0);  // the waits for the instrument are not unwound: nothing may run after this
     };
-    WizardParts parts{
-        app,    texts,   script,        port,    timer1,          engine,
-        file,   dialogs, programFolder, nullptr, DescribeComPort, [this] { endProcess(); },
-        nullptr};
+    WizardParts parts{.app = app,
+                      .texts = texts,
+                      .script = script,
+                      .port = port,
+                      .timer1 = timer1,
+                      .engine = engine,
+                      .file = file,
+                      .dialogs = dialogs,
+                      .programFolder = programFolder,
+                      .fontFamilies = {},
+                      .drawnFamily = {},
+                      .describePort = DescribeComPort,
+                      .endProcess = [this] { endProcess(); },
+                      .showFileChooser = {}};
     window = std::make_unique<FrmMain>(parts);
     dialogs.setOwner(window.get());
 }
