@@ -60,7 +60,8 @@ TEST(Help_Buttons, EachPageAtItsTopicAndF1AtTheContents) {
     QApplication::setActiveWindow(&r.w());
     ASSERT_TRUE(QTest::qWaitForWindowActive(&r.w()));
     r.w().GoToPage(3);
-    QTest::keyClick(&r.w(), Qt::Key_F1);
+    r.w().CmdHelp[3]->setFocus(Qt::TabFocusReason);
+    QTest::keyClick(QApplication::focusWidget(), Qt::Key_F1);
     EXPECT_EQ(r.w().helpViewer().shownContext(), 1);
     EXPECT_EQ(r.page(), 3);
     EXPECT_TRUE(r.shown().empty());
