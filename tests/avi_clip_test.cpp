@@ -1,6 +1,6 @@
 // The clip reader on our own clips and on truncated, oversized and corrupt ones: it plays what
 // it can, refuses the rest, and never reads outside the bytes (the sanitizer build checks).
-#include "ui/wizard/avi_clip.h"
+#include "clip/avi_clip.h"
 
 #include <gtest/gtest.h>
 

@@ -7,7 +7,7 @@ namespace zx917 {
 
 inline constexpr const char* kAppTitle = "Quorvex ZX917 Download Program";
 inline constexpr const char* kWindowTitle = "Quorvex ZX917 Download Program Ver.02.01";
-inline constexpr const char* kVersion = "2.1.0.0";
+inline constexpr const char* kVersion = ZX917_VERSION;  // the project's version
 inline constexpr const char* kVersionText = "2.01";
 inline constexpr const char* kExeBaseName = "ZX917A";
 inline constexpr const char* kHexFolderName = "HEX";

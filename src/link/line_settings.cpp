@@ -30,4 +30,44 @@ std::optional<LineSettings> ParseLineSettings(const std::string& text) {
     return s;
 }
 
+std::size_t TerminatorItem(std::string_view terminator) {
+    for (std::size_t i = 0; i + 1 < kTerminatorItems.size(); ++i) {
+        if (kTerminatorItems[i].value == terminator) return i;
+    }
+    return kTerminatorItems.size() - 1;
+}
+
+std::string TerminatorOf(int item) {
+    if (item == 0 || item == 1) return std::string(kTerminatorItems[item].value);
+    return std::string(kTerminatorItems.back().value);
+}
+
+std::optional<SettingsFields> SettingsFieldsOf(std::string_view s) {
+    const auto length = static_cast<int>(s.size());
+    const int k = s.find('.') != std::string_view::npos ? 2 : 0;
+    if (length - 6 - k < 1) return std::nullopt;
+    // Positions count from 1, as the fields are laid out from the right.
+    auto at = [&](int position) { return std::string(s.substr(position - 1, 1)); };
+    return SettingsFields{std::string(s.substr(0, length - 6 - k)), at(length - 4 - k),
+                          at(length - 2 - k), std::string(s.substr(length - 1 - k))};
+}
+
+namespace {
+std::string_view trimmed(std::string_view text) {
+    const auto blank = [](char c) { return std::isspace(static_cast<unsigned char>(c)) != 0; };
+    while (!text.empty() && blank(text.front())) text.remove_prefix(1);
+    while (!text.empty() && blank(text.back())) text.remove_suffix(1);
+    return text;
+}
+}  // namespace
+
+std::string SettingsTextOf(std::string_view speed, std::string_view parity,
+                           std::string_view dataBits, std::string_view stopBits) {
+    std::string out(trimmed(speed));
+    out.append(",").append(parity.substr(0, 1));
+    out.append(",").append(trimmed(dataBits));
+    out.append(",").append(trimmed(stopBits));
+    return out;
+}
+
 }  // namespace zx917

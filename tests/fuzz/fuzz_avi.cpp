@@ -2,7 +2,7 @@
 #include <cstddef>
 #include <cstdint>
 
-#include "ui/wizard/avi_clip.h"
+#include "clip/avi_clip.h"
 
 extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
     if (const auto clip = zx917::ReadAvi(std::span(data, size))) {

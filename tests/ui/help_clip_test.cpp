@@ -2,8 +2,11 @@
 // exactly while a transfer runs.
 #include <gtest/gtest.h>
 
+#include <QAbstractTextDocumentLayout>
 #include <QApplication>
 #include <QFile>
+#include <QScrollBar>
+#include <QTextBlock>
 #include <filesystem>
 
 #include "support/wizard_rig.h"
@@ -40,6 +43,36 @@ TEST(Help_File, HasEveryTopic) {
     }
 }
 
+// The topic shown: its anchor stands at the top of the view, or as near the top as the end of
+// the document lets the view scroll.
+::testing::AssertionResult TopicAtTop(ui::HelpViewer& help, int32_t context) {
+    QTextBrowser* view = help.window();
+    if (view == nullptr || !view->isVisible()) return ::testing::AssertionFailure() << "no window";
+    QApplication::processEvents();
+    const QString anchor = ui::HelpAnchor(context);
+    QTextDocument* doc = view->document();
+    // An empty anchor before a heading names the heading's block.
+    auto named = [&](const QTextBlock& b) {
+        if (b.charFormat().anchorNames().contains(anchor)) return true;
+        for (auto it = b.begin(); !it.atEnd(); ++it) {
+            if (it.fragment().charFormat().anchorNames().contains(anchor)) return true;
+        }
+        return false;
+    };
+    for (QTextBlock b = doc->begin(); b.isValid(); b = b.next()) {
+        if (!named(b)) continue;
+        const int top = static_cast<int>(doc->documentLayout()->blockBoundingRect(b).top());
+        const QScrollBar* bar = view->verticalScrollBar();
+        const bool atTop = std::abs(bar->value() - top) <= 2;
+        const bool asFarAsItGoes = bar->value() == bar->maximum() && top > bar->value() &&
+                                   top < bar->value() + view->viewport()->height();
+        if (atTop || asFarAsItGoes) return ::testing::AssertionSuccess();
+        return ::testing::AssertionFailure()
+               << anchor.toStdString() << " at " << top << ", view at " << bar->value();
+    }
+    return ::testing::AssertionFailure() << "no anchor " << anchor.toStdString();
+}
+
 TEST(Help_Buttons, EachPageAtItsTopicAndF1AtTheContents) {
     WizardRig r;
     installFiles(r);
@@ -49,20 +82,24 @@ TEST(Help_Buttons, EachPageAtItsTopicAndF1AtTheContents) {
         r.w().GoToPage(n);
         r.click(r.w().CmdHelp[n]);
         auto& help = r.w().helpViewer();
-        EXPECT_EQ(help.shownContext(), contexts[n]);
         EXPECT_TRUE(help.fileRead());
-        ASSERT_NE(help.window(), nullptr);
-        EXPECT_TRUE(help.window()->isVisible());
-        EXPECT_FALSE(help.window()->isModal());
+        EXPECT_TRUE(TopicAtTop(help, contexts[n]));
         EXPECT_EQ(r.page(), n);  // the wizard stays on its page
     }
+    // The topics' links work: the contents link of a topic leads to the contents.
+    QTextBrowser* view = r.w().helpViewer().window();
+    view->setSource(QUrl(view->source().toString(QUrl::RemoveFragment) + "#context-1"));
+    EXPECT_TRUE(TopicAtTop(r.w().helpViewer(), 1));
+    view->backward();
+    EXPECT_TRUE(TopicAtTop(r.w().helpViewer(), 24));
+    r.w().GoToPage(3);
+    r.click(r.w().CmdHelp[3]);  // away from the contents first
     r.w().activateWindow();
     QApplication::setActiveWindow(&r.w());
     ASSERT_TRUE(QTest::qWaitForWindowActive(&r.w()));
-    r.w().GoToPage(3);
     r.w().CmdHelp[3]->setFocus(Qt::TabFocusReason);
     QTest::keyClick(QApplication::focusWidget(), Qt::Key_F1);
-    EXPECT_EQ(r.w().helpViewer().shownContext(), 1);
+    EXPECT_TRUE(TopicAtTop(r.w().helpViewer(), 1));
     EXPECT_EQ(r.page(), 3);
     EXPECT_TRUE(r.shown().empty());
 }
@@ -106,13 +143,13 @@ TEST(Clip_Transfer, PlaysWhileTheTransferRunsAndStopsOnEveryEnd) {
         r.choose(DownloadFile("A.02.00", 6), "A.02.00");
         r.click(r.w().CmdNext[2]);
         bool playedDuring = false;
-        int helpDuring = 0;
+        bool helpDuring = false;
         r.world.port.onSent = [&](const test::Sent&) {
             playedDuring = playedDuring || clip.playing();
-            if (r.world.app.ScriptStage == 5 && helpDuring == 0) {
+            if (r.world.app.ScriptStage == 5 && !helpDuring) {
                 // Help during the transfer: it opens and the transfer goes on.
                 r.click(r.w().CmdHelp[4]);
-                helpDuring = r.w().helpViewer().shownContext();
+                helpDuring = TopicAtTop(r.w().helpViewer(), 23);
             }
         };
         r.dialogs.answers = {true};
@@ -121,7 +158,7 @@ TEST(Clip_Transfer, PlaysWhileTheTransferRunsAndStopsOnEveryEnd) {
         EXPECT_FALSE(clip.playing());
         EXPECT_EQ(r.page(), c.page);
         if (c.page == 5) {
-            EXPECT_EQ(helpDuring, 23);
+            EXPECT_TRUE(helpDuring);
         }
     }
 }
@@ -135,7 +172,6 @@ TEST(Clip_Transfer, MissingOrBrokenClipLeavesThePlayerEmpty) {
     EXPECT_FALSE(r.w().Animation1->playing());
     std::filesystem::remove(r.folder.path() + "/Filemove.avi");
     EXPECT_FALSE(r.w().Animation1->open(r.folder.path() + "/Filemove.avi"));
-    EXPECT_EQ(r.page(), 0);
 }
 
 }  // namespace

@@ -8,6 +8,7 @@
 #include <QGroupBox>
 #include <QLabel>
 #include <QPushButton>
+#include <set>
 
 #include "support/wizard_rig.h"
 #include "ui/common/centre.h"
@@ -174,6 +175,67 @@ TEST(Wizard_Pages, EveryControlAsDesigned) {
                         return std::string(n) == c.name;
                     }) != std::end(kCentred);
                 EXPECT_EQ(bool(l->alignment() & Qt::AlignHCenter), centred);
+            }
+        }
+    }
+}
+
+// Where a control draws, in page coordinates: a label, aligned at its top, only as far down as
+// its text.
+QRect drawn(QWidget* w, QWidget* page) {
+    QSize size = w->size();
+    if (auto* l = qobject_cast<QLabel*>(w)) {
+        const int text = l->wordWrap() ? l->heightForWidth(l->width()) : l->sizeHint().height();
+        size.setHeight(std::min(l->height(), text));
+    }
+    return {w->mapTo(page, QPoint()), size};
+}
+
+// What the geometry table cannot see: in the shipped font, every caption fits its control, and
+// no two controls of a page overlap but Back and Execute, which the design makes touch. The
+// labels filled at run time hold long values.
+TEST(Wizard_Pages, CaptionsFitAndNothingOverlaps) {
+    WizardRig r;
+    r.w().settings->ProtSettings();
+    ui::SetCaption(r.w().CurFirmInfo[2], "W.88.88");
+    ui::SetCaption(r.w().NewFirmInfo[2], "W.88.88");
+    ui::SetCaption(r.w().NewFirmFile[2], "WWWWWWWW.HEX");
+    ui::SetCaption(r.w().RemTime[2], "999:59");
+    r.w().setByteLabel("99999999Byte");
+    r.w().setRemainingTime(4, "999:59");
+    const std::set<std::pair<QString, QString>> touching = {{"CmdBack_3", "CmdNext_3"}};
+    for (int n = 0; n < ui::kPages; ++n) {
+        SCOPED_TRACE(n);
+        r.w().GoToPage(n);
+        QWidget* page = r.w().Picture4[n];
+        std::vector<QWidget*> controls;
+        for (QWidget* w : page->findChildren<QWidget*>()) {
+            if (w->objectName().isEmpty() || w->objectName().startsWith("qt_")) continue;
+            if (!w->isVisibleTo(page)) continue;
+            controls.push_back(w);
+            const QSize hint = w->sizeHint();
+            if (auto* l = qobject_cast<QLabel*>(w); l && l->wordWrap()) {
+                EXPECT_LE(l->heightForWidth(l->width()), l->height())
+                    << l->objectName().toStdString();
+            } else if (qobject_cast<QLabel*>(w) || qobject_cast<QPushButton*>(w)) {
+                EXPECT_LE(hint.width(), w->width()) << w->objectName().toStdString();
+                EXPECT_LE(hint.height(), w->height()) << w->objectName().toStdString();
+            } else if (auto* g = qobject_cast<QGroupBox*>(w)) {
+                EXPECT_LT(g->fontMetrics().horizontalAdvance(g->title()), g->width());
+            }
+        }
+        for (std::size_t i = 0; i < controls.size(); ++i) {
+            for (std::size_t j = i + 1; j < controls.size(); ++j) {
+                QWidget* a = controls[i];
+                QWidget* b = controls[j];
+                if (a->isAncestorOf(b) || b->isAncestorOf(a)) continue;
+                const QRect ra = drawn(a, page);
+                const QRect rb = drawn(b, page);
+                if (!ra.intersects(rb)) continue;
+                const auto pair = std::minmax(a->objectName(), b->objectName());
+                EXPECT_TRUE(touching.contains({pair.first, pair.second}))
+                    << a->objectName().toStdString() << " overlaps "
+                    << b->objectName().toStdString();
             }
         }
     }

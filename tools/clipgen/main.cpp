@@ -6,7 +6,7 @@
 #include <fstream>
 #include <iostream>
 
-#include "ui/wizard/avi_clip.h"
+#include "clip/avi_clip.h"
 
 namespace {
 

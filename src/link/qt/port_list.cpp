@@ -57,4 +57,10 @@ SystemPort DescribedComDevice(int16_t port) {
     return p;
 }
 
+std::string DescribeComPort(int16_t port) {
+    const SystemPort d = DescribedComDevice(port);
+    if (d.path.empty()) return {};
+    return d.description.empty() ? d.path : d.path + " - " + d.description;
+}
+
 }  // namespace zx917

@@ -25,5 +25,7 @@ std::vector<SystemPort> SystemPorts();
 SystemPort ComDevice(int16_t port);
 // The same with the system's description of the device, also when a variable names it.
 SystemPort DescribedComDevice(int16_t port);
+// "/dev/ttyUSB0 - FT232R USB UART", the device and description of port n; empty when none.
+std::string DescribeComPort(int16_t port);
 
 }  // namespace zx917

@@ -5,6 +5,7 @@
 #include <QShortcut>
 #include <utility>
 
+#include "app/captions.h"
 #include "app/identity.h"
 #include "firmware/download_file.h"
 #include "firmware/file_choice.h"
@@ -22,16 +23,20 @@ namespace {
 
 constexpr int kNameRole = Qt::UserRole;  // a file list entry's real name
 
-QLabel* makeLabel(QWidget* parent, const char* name, const char* text, QRect at) {
-    auto* l = new QLabel(QString::fromLatin1(text), parent);
+QString caption(const char* control) {
+    return FromLatin1(std::string(CaptionOf("FrmNewSel", control)));
+}
+
+QLabel* makeLabel(QWidget* parent, const char* name, QRect at) {
+    auto* l = new QLabel(caption(name), parent);
     l->setObjectName(name);
     l->setTextFormat(Qt::PlainText);
     l->setGeometry(at);
     return l;
 }
 
-QPushButton* makeButton(QWidget* parent, const char* name, const char* caption, QRect at) {
-    auto* b = new QPushButton(QString::fromLatin1(caption), parent);
+QPushButton* makeButton(QWidget* parent, const char* name, QRect at) {
+    auto* b = new QPushButton(caption(name), parent);
     b->setObjectName(name);
     b->setGeometry(at);
     // Enter in the name box checks the file; it must never press a button for it.
@@ -47,13 +52,13 @@ FrmNewSel::FrmNewSel(const ChooserParts& parts, QWidget* owner)
                          Qt::WindowCloseButtonHint | Qt::MSWindowsFixedSizeDialogHint),
       p_(parts) {
     setObjectName("FrmNewSel");
-    setWindowTitle("Open");
+    setWindowTitle(caption("FrmNewSel"));
     setWindowModality(Qt::WindowModal);
     setFixedSize(px(7080), px(4440));
 
     // Left: drives and folders. Middle: files, then the name and type rows. Right: the buttons
     // and the revisions.
-    Label1 = makeLabel(this, "Label1", "Lookin:", twips(120, 120, 2415, 255));
+    Label1 = makeLabel(this, "Label1", twips(120, 120, 2415, 255));
     drvlist = new QComboBox(this);
     drvlist->setObjectName("drvlist");
     drvlist->setGeometry(twips(120, 390, 2415, 345));
@@ -63,25 +68,25 @@ FrmNewSel::FrmNewSel(const ChooserParts& parts, QWidget* owner)
     File = new QListWidget(this);
     File->setObjectName("File");
     File->setGeometry(twips(2655, 390, 2655, 2415));
-    Label2 = makeLabel(this, "Label2", "File Name:", twips(120, 3465, 1335, 255));
+    Label2 = makeLabel(this, "Label2", twips(120, 3465, 1335, 255));
     FileName = new QLineEdit(this);
     FileName->setObjectName("FileName");
     FileName->setGeometry(twips(1455, 3420, 3855, 345));
-    Label3 = makeLabel(this, "Label3", "File of type:", twips(120, 3915, 1335, 255));
+    Label3 = makeLabel(this, "Label3", twips(120, 3915, 1335, 255));
     RetFile = new QComboBox(this);
     RetFile->setObjectName("RetFile");
     RetFile->setEditable(true);
     RetFile->setInsertPolicy(QComboBox::NoInsert);
     RetFile->setGeometry(twips(1455, 3870, 3855, 345));
-    OpenCom = makeButton(this, "OpenCom", "&Open", twips(5550, 390, 1335, 375));
-    CanselCom = makeButton(this, "CanselCom", "&Cancel", twips(5550, 870, 1335, 375));
-    Frame1 = new QGroupBox("Firmware REV", this);
+    OpenCom = makeButton(this, "OpenCom", twips(5550, 390, 1335, 375));
+    CanselCom = makeButton(this, "CanselCom", twips(5550, 870, 1335, 375));
+    Frame1 = new QGroupBox(caption("Frame1"), this);
     Frame1->setObjectName("Frame1");
     Frame1->setGeometry(twips(5430, 2520, 1575, 1695));
-    makeLabel(Frame1, "Label6", "Current:", twips(120, 300, 1335, 255));
-    FirmRev1 = makeLabel(Frame1, "FirmRev1", "", twips(240, 570, 1215, 255));
-    makeLabel(Frame1, "Label4", "New:", twips(120, 960, 1335, 255));
-    FirmRev2 = makeLabel(Frame1, "FirmRev2", "", twips(240, 1230, 1215, 255));
+    makeLabel(Frame1, "Label6", twips(120, 300, 1335, 255));
+    FirmRev1 = makeLabel(Frame1, "FirmRev1", twips(240, 570, 1215, 255));
+    makeLabel(Frame1, "Label4", twips(120, 960, 1335, 255));
+    FirmRev2 = makeLabel(Frame1, "FirmRev2", twips(240, 1230, 1215, 255));
 
     setTabOrder(drvlist, dirlist);
     setTabOrder(dirlist, File);

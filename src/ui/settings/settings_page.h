@@ -1,5 +1,6 @@
 // The settings page: the probe of Com1 and Com2, the option lists filled from the port's
-// settings, Preset, and the engineer's choice applied to the port.
+// settings, Preset, and the engineer's choice applied to the port. The rules are the core's
+// (ProbePorts, SettingsFieldsOf, SettingsTextOf); the lists carry the values they stand for.
 #pragma once
 
 #include <QComboBox>
@@ -29,10 +30,10 @@ struct SettingsParts {
 
 inline constexpr int16_t kProbedPorts = 2;
 
-class SettingsPage {
+class SettingsPage : public QWidget {
 public:
-    // Builds the page's instruction, port list and "Settings" frame on the page container.
-    SettingsPage(QWidget* page, const SettingsParts& parts);
+    // The page itself, with its instruction, port list and "Settings" frame.
+    SettingsPage(const SettingsParts& parts, QWidget* window);
 
     bool ProtSettings();
     void cmdReset_Click();
@@ -40,8 +41,6 @@ public:
 
     // The seven lists and Preset; identification disables them while it runs.
     void setListsEnabled(bool enabled);
-    // The page's focusable controls in the order of their tab stops.
-    std::vector<QWidget*> tabStops() const;
 
     QLabel* Label7_1;
     QLabel* Label3;
@@ -57,6 +56,8 @@ public:
 
 private:
     void ProtSettingsShow();
+    // Selects in the lists what a settings text, terminator and handshaking code stand for.
+    void show(const std::string& settings, const std::string& terminator, int16_t handshaking);
 
     SettingsParts p_;
 };

@@ -2,7 +2,7 @@
 
 #include <QPainter>
 
-#include "ui/wizard/avi_clip.h"
+#include "clip/avi_clip.h"
 
 namespace zx917::ui {
 

@@ -29,10 +29,9 @@
 #include "ui/settings/settings_page.h"
 #include "ui/wizard/clip_player.h"
 #include "ui/wizard/help_viewer.h"
+#include "ui/wizard/page_table.h"
 
 namespace zx917::ui {
-
-inline constexpr int kPages = 6;
 
 struct WizardParts {
     AppState& app;
@@ -114,7 +113,7 @@ public:
     QGroupBox* Frame1 = nullptr;
     QGroupBox* Frame2 = nullptr;
     ClipPlayer* Animation1 = nullptr;
-    std::unique_ptr<SettingsPage> settings;
+    SettingsPage* settings = nullptr;  // page 1's container
 
 protected:
     void closeEvent(QCloseEvent* event) override;
@@ -122,9 +121,8 @@ protected:
 private:
     void buildPages();
     void buildButtonRow(int page);
-    void buildSummary(int page);
+    void buildSummary(int page, const SummaryRow& summary);
     void SetPage(int page, bool show);
-    std::vector<QWidget*> pageTabStops(int page) const;
     // The transfer page's bar, byte count and remaining time change with every record; they are
     // shown at most every kProgressRefresh, the latest values always.
     void showProgressSoon();
@@ -135,6 +133,7 @@ private:
     HelpViewer help_;
     EnterClicks enterClicks_;
     std::string helpFile_;
+    std::array<std::vector<QWidget*>, kPages> tabStops_;  // each page's, in tab order
     QTimer progressTimer_;
     QElapsedTimer progressShown_;
     std::optional<int32_t> pendingValue_;

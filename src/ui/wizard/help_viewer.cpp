@@ -1,6 +1,7 @@
 #include "ui/wizard/help_viewer.h"
 
-#include <QFile>
+#include <QFileInfo>
+#include <QUrl>
 
 #include "app/identity.h"
 #include "ui/common/qt_text.h"
@@ -23,21 +24,19 @@ void HelpViewer::show(const std::string& helpFile, int32_t context) {
         window_->setOpenExternalLinks(false);
         window_->resize(560, 460);
     }
-    QFile file(FromFileName(helpFile));
-    QByteArray html;
-    fileRead_ = file.open(QIODevice::ReadOnly) && file.size() <= kHelpFileLimit;
-    if (fileRead_) html = file.readAll();
-    if (!fileRead_ || html.isEmpty()) {
-        fileRead_ = false;
+    const QFileInfo file(FromFileName(helpFile));
+    fileRead_ =
+        file.isFile() && file.isReadable() && file.size() > 0 && file.size() <= kHelpFileLimit;
+    if (fileRead_) {
+        QUrl topic = QUrl::fromLocalFile(file.absoluteFilePath());
+        topic.setFragment(HelpAnchor(context));
+        window_->setSource(topic, QTextDocument::HtmlResource);
+    } else {
         window_->setPlainText("The help file could not be read:\n" + FromFileName(helpFile) +
                               "\n\nIt belongs beside the program. The program goes on without it.");
-    } else {
-        window_->setHtml(QString::fromUtf8(html));
     }
-    shownContext_ = context;
     window_->show();
     window_->raise();
-    if (fileRead_) window_->scrollToAnchor(HelpAnchor(context));
 }
 
 void HelpViewer::close() {

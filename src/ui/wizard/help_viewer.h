@@ -1,6 +1,7 @@
 // The help window: our HTML help file shown at the topic of a context number, in one non-modal
 // window of its own that leaves the wizard usable and on its page. It has no owner window, so
-// the modal file chooser does not block it either.
+// the modal file chooser does not block it either. The file is its source: its anchors,
+// links and the back and forward history work as in any browser.
 #pragma once
 
 #include <QTextBrowser>
@@ -23,12 +24,10 @@ public:
     void close();
 
     QTextBrowser* window() const { return window_.get(); }
-    int32_t shownContext() const { return shownContext_; }
     bool fileRead() const { return fileRead_; }
 
 private:
     std::unique_ptr<QTextBrowser> window_;
-    int32_t shownContext_ = 0;
     bool fileRead_ = false;
 };
 

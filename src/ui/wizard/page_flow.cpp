@@ -1,9 +1,11 @@
-// The page flow: the load step, the forward, back and cancel buttons, and the unload step.
+// The page flow: the load step, the forward, back, cancel and help buttons, the file choice of
+// page 2, and the unload step.
 #include <QCloseEvent>
 #include <QShortcut>
 
 #include "app/identity.h"
 #include "firmware/revision.h"
+#include "ui/chooser/frm_new_sel.h"
 #include "ui/common/centre.h"
 #include "ui/common/qt_text.h"
 #include "ui/common/twips.h"
@@ -14,15 +16,20 @@ namespace zx917::ui {
 namespace {
 constexpr int kClientWidth = 8388;
 constexpr int kClientHeight = 4416;
-constexpr int32_t kF1Context = 1;
 }  // namespace
 
 FrmMain::FrmMain(const WizardParts& parts)
     : QWidget(nullptr, Qt::Dialog | Qt::CustomizeWindowHint | Qt::WindowTitleHint |
                            Qt::WindowCloseButtonHint | Qt::MSWindowsFixedSizeDialogHint),
       p_(parts),
-      ops_(FirmwareParts{parts.app, parts.texts, parts.dialogs, parts.file, parts.engine,
-                         parts.port, parts.timer1, *this}) {
+      ops_(FirmwareParts{.app = parts.app,
+                         .texts = parts.texts,
+                         .dialogs = parts.dialogs,
+                         .file = parts.file,
+                         .engine = parts.engine,
+                         .port = parts.port,
+                         .timer1 = parts.timer1,
+                         .view = *this}) {
     setObjectName("FrmMain");
     setWindowTitle(QString::fromLatin1(kWindowTitle));
     setFixedSize(px(kClientWidth), px(kClientHeight));
@@ -101,8 +108,35 @@ void FrmMain::CmdNext_Click(int16_t index) {
     }
 }
 
+void FrmMain::CmdFirmSelect_Click() {
+    if (p_.showFileChooser) {
+        p_.showFileChooser();
+    } else {
+        // Loaded for this use and unloaded when the engineer has left it.
+        FrmNewSel chooser(ChooserParts{.app = p_.app,
+                                       .texts = p_.texts,
+                                       .file = p_.file,
+                                       .dialogs = p_.dialogs,
+                                       .programFolder = p_.programFolder,
+                                       .showHelp = [this](int32_t c) { help_.show(helpFile_, c); },
+                                       .listFiles = {}},
+                          this);
+        chooser.Form_Load();
+        chooser.exec();
+    }
+    const QString revision = FromLatin1(StripFillers(p_.app.SelectedRevision.str()));
+    SetCaption(NewFirmInfo[2], revision);
+    SetCaption(NewFirmFile[2], FromFileName(p_.app.SelectedFileName));
+    CmdNext[2]->setEnabled(!revision.isEmpty());
+}
+
 void FrmMain::CmdBack_Click(int16_t index) {
     if (index == 3) GoToPage(2);
+}
+
+void FrmMain::CmdHelp_Click(int16_t index) {
+    if (index < 0 || index >= kPages) return;
+    help_.show(helpFile_, kPageRows[index].helpContext);
 }
 
 void FrmMain::CmdExit_Click(int16_t index) {

@@ -54,10 +54,4 @@ public:
     std::unique_ptr<FrmMain> window;
 };
 
-// "/dev/ttyUSB0 - FT232R USB UART" for the settings page's tooltip of Com<n>.
-std::string DescribeComPort(int16_t port);
-
-// The program's icon, drawn here: no file to lose.
-QIcon ProgramIcon();
-
 }  // namespace zx917::ui

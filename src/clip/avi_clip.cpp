@@ -1,4 +1,4 @@
-#include "ui/wizard/avi_clip.h"
+#include "clip/avi_clip.h"
 
 #include <algorithm>
 #include <cstring>
