@@ -1,5 +1,7 @@
 #include "app/startup.h"
 
+#include <unistd.h>
+
 #include <filesystem>
 #include <system_error>
 
@@ -7,13 +9,20 @@
 
 namespace zx917 {
 
-void CreateHexFolder(const std::string& programFolder) {
-    const std::filesystem::path path = JoinPath(programFolder, kHexFolderName);
+namespace fs = std::filesystem;
+
+std::string CreateHexFolder(const std::string& programFolder, const std::string& userDataFolder) {
+    const std::string beside = JoinPath(programFolder, kHexFolderName);
     std::error_code ec;
-    if (std::filesystem::symlink_status(path, ec).type() != std::filesystem::file_type::not_found)
-        return;
-    // A read-only program folder: the chooser's recovery meets the missing folder later.
-    std::filesystem::create_directory(path, ec);
+    if (fs::symlink_status(beside, ec).type() != fs::file_type::not_found) return beside;
+    if (::access(programFolder.c_str(), W_OK | X_OK) == 0 && fs::create_directory(beside, ec))
+        return beside;
+    if (!userDataFolder.empty()) {
+        const std::string own = JoinPath(userDataFolder, kHexFolderName);
+        fs::create_directories(own, ec);
+        if (fs::is_directory(own, ec)) return own;
+    }
+    return beside;
 }
 
 }  // namespace zx917

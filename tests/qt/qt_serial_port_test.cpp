@@ -3,11 +3,13 @@
 #include "link/qt/qt_serial_port.h"
 
 #include <gtest/gtest.h>
+#include <linux/serial.h>
 #include <sys/ioctl.h>
 
 #include <QCoreApplication>
 #include <QElapsedTimer>
 #include <cstdlib>
+#include <optional>
 #include <vector>
 
 #include "app/app_state.h"
@@ -113,6 +115,60 @@ TEST(QtSerialPort_Dsr, EngineRecoveryThroughTheRealAdapter) {
     EXPECT_LT(took, 2500);
     EXPECT_EQ(pty.readAll().substr(0, 8),
               std::string(app.RecordBytes.begin(), app.RecordBytes.end()));
+}
+
+// The driver's serial flags through the seam: low latency asked on open, the old flags back on
+// close; a driver that has no flags or refuses leaves the port working, and the trace says so.
+TEST(QtSerialPort_LowLatency, AskedOnOpenAndPutBackOnClose) {
+    struct Case {
+        const char* name;
+        std::optional<int> flags;  // the driver's; none: it has no serial flags
+        bool refuses;
+        std::vector<int> written;
+        std::string noted;
+    };
+    const int other = 0x40;  // a flag of the driver's own that stays as it is
+    const Case cases[] = {
+        {"an adapter", other, false, {other | ASYNC_LOW_LATENCY, other}, "low latency on"},
+        {"already low", other | ASYNC_LOW_LATENCY, false, {}, "low latency already on"},
+        {"a refusing driver",
+         other,
+         true,
+         {other | ASYNC_LOW_LATENCY},
+         "no low latency: the driver refused it"},
+        {"a pseudo-terminal",
+         std::nullopt,
+         false,
+         {},
+         "no low latency: the device has no serial flags"},
+    };
+    test::Pty pty;
+    ::setenv("ZX917_COM1", pty.path().c_str(), 1);
+    for (const Case& c : cases) {
+        SCOPED_TRACE(c.name);
+        QtSerialPort port;
+        std::vector<int> written;
+        std::vector<std::string> notes;
+        port.readSerialFlags = [&c](int, int& flags) {
+            if (c.flags) flags = *c.flags;
+            return c.flags.has_value();
+        };
+        port.writeSerialFlags = [&](int, int flags) {
+            written.push_back(flags);
+            return !c.refuses;
+        };
+        port.onNote = [&notes](const std::string& n) { notes.push_back(n); };
+        ASSERT_TRUE(port.setPortOpen(true)) << port.errorText();
+        ASSERT_TRUE(port.setPortOpen(false));
+        EXPECT_EQ(written, c.written);
+        EXPECT_EQ(notes, std::vector<std::string>{c.noted});
+    }
+    // The real driver calls on a pseudo-terminal: it has no serial flags, and the port opens.
+    QtSerialPort real;
+    std::vector<std::string> notes;
+    real.onNote = [&notes](const std::string& n) { notes.push_back(n); };
+    ASSERT_TRUE(real.setPortOpen(true)) << real.errorText();
+    EXPECT_EQ(notes, std::vector<std::string>{"no low latency: the device has no serial flags"});
 }
 
 }  // namespace

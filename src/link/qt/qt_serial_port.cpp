@@ -1,5 +1,6 @@
 #include "link/qt/qt_serial_port.h"
 
+#include <linux/serial.h>
 #include <sys/ioctl.h>
 
 #include <algorithm>
@@ -34,7 +35,48 @@ QtSerialPort::QtSerialPort(QObject* parent) : QObject(parent) {
 }
 
 QtSerialPort::~QtSerialPort() {
-    if (port_.isOpen()) port_.close();
+    closeDevice();
+}
+
+void QtSerialPort::closeDevice() {
+    if (!port_.isOpen()) return;
+    if (flagsBefore_ && !writeSerialFlags(port_.handle(), *flagsBefore_))
+        note("the driver did not take its serial flags back");
+    flagsBefore_.reset();
+    port_.close();
+}
+
+void QtSerialPort::note(const std::string& text) {
+    if (onNote) onNote(text);
+}
+
+void QtSerialPort::askLowLatency() {
+    flagsBefore_.reset();
+    int flags = 0;
+    if (!readSerialFlags(port_.handle(), flags)) {
+        note("no low latency: the device has no serial flags");
+    } else if ((flags & ASYNC_LOW_LATENCY) != 0) {
+        note("low latency already on");
+    } else if (writeSerialFlags(port_.handle(), flags | ASYNC_LOW_LATENCY)) {
+        flagsBefore_ = flags;
+        note("low latency on");
+    } else {
+        note("no low latency: the driver refused it");
+    }
+}
+
+bool QtSerialPort::ReadSerialFlags(int fd, int& flags) {
+    serial_struct s{};
+    if (::ioctl(fd, TIOCGSERIAL, &s) != 0) return false;
+    flags = s.flags;
+    return true;
+}
+
+bool QtSerialPort::WriteSerialFlags(int fd, int flags) {
+    serial_struct s{};
+    if (::ioctl(fd, TIOCGSERIAL, &s) != 0) return false;
+    s.flags = flags;
+    return ::ioctl(fd, TIOCSSERIAL, &s) == 0;
 }
 
 std::string QtSerialPort::DevicePath(int16_t port) {
@@ -80,7 +122,7 @@ bool QtSerialPort::setPortOpen(bool open) {
         dsrPoll_.stop();
         drainCheck_.stop();
         sendPending_ = false;
-        if (port_.isOpen()) port_.close();
+        closeDevice();
         return true;
     }
     if (port_.isOpen()) return true;
@@ -103,6 +145,7 @@ bool QtSerialPort::setPortOpen(bool open) {
         port_.close();
         return false;
     }
+    askLowLatency();
     dsr_ = false;
     int bits = 0;
     if (readModemLines(port_.handle(), bits)) {
@@ -199,7 +242,7 @@ void QtSerialPort::portFailed(const QString& why) {
     dsrPoll_.stop();
     drainCheck_.stop();
     sendPending_ = false;
-    port_.close();
+    closeDevice();
     queue(kCommEvFailed);
 }
 

@@ -6,6 +6,7 @@
 #include <QSerialPort>
 #include <QTimer>
 #include <chrono>
+#include <optional>
 #include <string>
 
 #include "link/serial_port.h"
@@ -48,6 +49,19 @@ public:
     static bool ReadModemLines(int fd, int& bits);
     ModemLineReader readModemLines = ReadModemLines;
 
+    // The driver's serial flags (TIOCGSERIAL, TIOCSSERIAL); false when it has none or refuses,
+    // as a pseudo-terminal does. On open the port asks for low latency: stop-and-wait pays the
+    // adapter's receive latency (16 ms on FTDI adapters) once a record. A test replaces them.
+    using SerialFlagsReader = std::function<bool(int fd, int& flags)>;
+    using SerialFlagsWriter = std::function<bool(int fd, int flags)>;
+    static bool ReadSerialFlags(int fd, int& flags);
+    static bool WriteSerialFlags(int fd, int flags);
+    SerialFlagsReader readSerialFlags = ReadSerialFlags;
+    SerialFlagsWriter writeSerialFlags = WriteSerialFlags;
+
+    // What the adapter did that a support trace should show (low latency asked, refused).
+    std::function<void(const std::string&)> onNote;
+
 private:
     void raise(int16_t code);
     void queue(int16_t code);
@@ -55,6 +69,10 @@ private:
     void pollModemLines();
     void portFailed(const QString& why);
     bool apply(const std::string& settings, int16_t handshaking);
+    void askLowLatency();
+    // Closes the device, with the driver's flags as they were before it was opened.
+    void closeDevice();
+    void note(const std::string& text);
 
     static constexpr std::chrono::milliseconds kDsrPoll{100};
     static constexpr std::chrono::milliseconds kDrainRecheck{2};
@@ -74,6 +92,7 @@ private:
     int16_t event_ = kCommEvNone;
     bool dsr_ = false;
     bool sendPending_ = false;
+    std::optional<int> flagsBefore_;  // the driver's flags to put back on close
     std::string error_;
 };
 

@@ -85,6 +85,7 @@ void AttachTrace(TraceWriter& trace, QtSerialPort& port, Engine& engine) {
         trace.traffic(sent, bytes, port.settings() + (hs ? " hs" + std::to_string(hs) : ""));
     };
     engine.setTrace([&trace](const std::string& e) { trace.event(e); });
+    port.onNote = [&trace](const std::string& e) { trace.event("port: " + e); };
 }
 
 }  // namespace zx917

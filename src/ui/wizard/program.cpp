@@ -2,12 +2,14 @@
 
 #include <unistd.h>
 
+#include <QStandardPaths>
 #include <cstdio>
 
 #include "app/identity.h"
 #include "app/startup.h"
 #include "link/port_defaults.h"
 #include "link/qt/port_list.h"
+#include "ui/common/qt_text.h"
 
 namespace zx917::ui {
 
@@ -19,6 +21,9 @@ int scaled(int normalMs, int tickMs) {
 
 Program::Program(const ProgramOptions& o)
     : programFolder(o.programFolder.empty() ? ProgramFolder() : o.programFolder),
+      userDataFolder(!o.userDataFolder.empty() ? o.userDataFolder
+                                               : ToFileName(QStandardPaths::writableLocation(
+                                                     QStandardPaths::AppDataLocation))),
       retry(scaled(kRetryIntervalMs, o.tickMs)),
       rsRetry(scaled(kRsRetryIntervalMs, o.tickMs)),
       timer1(scaled(kTimer1IntervalMs, o.tickMs)),
@@ -53,9 +58,11 @@ Program::Program(const ProgramOptions& o)
 Program::~Program() = default;
 
 void Program::Main() {
-    CreateHexFolder(programFolder);
+    const std::string hexFolder = CreateHexFolder(programFolder, userDataFolder);
     window->Form_Load();
     InitDefaults(app, port, programFolder);
+    app.HexFolder = hexFolder;  // where start-up could make it
+    if (trace) trace->event("download folder: " + hexFolder);
     if (trace) trace->event("start: port 1 at " + port.settings() + ", closed");
     window->show();
 }

@@ -22,8 +22,11 @@ namespace zx917::ui {
 
 struct ProgramOptions {
     std::string programFolder;  // the executable's folder when empty
-    std::string traceFile;      // support trace of the line; none when empty
-    int tickMs = 1000;          // the 1000 ms tick; only tests shorten it
+    // Where the download folder goes when the program's folder is not the user's to write:
+    // the application's data folder (~/.local/share/ZX917A) when empty.
+    std::string userDataFolder;
+    std::string traceFile;  // support trace of the line; none when empty
+    int tickMs = 1000;      // the 1000 ms tick; only tests shorten it
 };
 
 class Program {
@@ -39,6 +42,7 @@ public:
     std::function<void()> endProcess;
 
     const std::string programFolder;
+    const std::string userDataFolder;
     AppState app;
     TextTables texts;
     CommandScript script;
