@@ -44,6 +44,11 @@ public:
     }
     ~SimProcess() { stop(); }
     bool ready() const { return std::filesystem::exists(link_); }
+    // The instrument's side of the line goes at once, as when the adapter is pulled.
+    void pull() {
+        proc_.kill();
+        proc_.waitForFinished(5000);
+    }
     const std::string& link() const { return link_; }
     // Ends the simulator and returns its report.
     std::string stop() {

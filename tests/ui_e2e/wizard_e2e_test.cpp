@@ -183,6 +183,47 @@ TEST(E2e_Wizard, AbortMidTransferEndsOnPageZero) {
     EXPECT_NE(report.find("\"verdict\": \"failure\""), std::string::npos);
 }
 
+// The adapter pulled in the middle of the transfer: "Download failed." and page 0, within the
+// time-out of the record on the line, with nothing reported as done.
+TEST(E2e_Wizard, PulledAdapterMidTransferEndsOnPageZero) {
+    gen::TempDir dir;
+    ModalAnswerer answer;
+    const std::string file = test::MakeDownloadFile(dir.path() + "/NEW.HEX", "A.02.00");
+    SimProcess sim(dir.path(), {"--expect", QString::fromStdString(file), "--line-rate"});
+    ASSERT_TRUE(sim.ready());
+    ::setenv("ZX917_COM1", sim.link().c_str(), 1);
+    E2e e;
+    e.click(e.w().CmdNext[0]);
+    ASSERT_TRUE(e.waitPage(1, kStep));
+    e.click(e.w().CmdNext[1]);
+    ASSERT_TRUE(e.waitPage(2, kStep));
+    e.program->app.FilePath = file;
+    e.program->app.SelectedFileName = "NEW.HEX";
+    e.program->app.SelectedRevision = "A.02.00";
+    e.w().CmdNext[2]->setEnabled(true);
+    e.click(e.w().CmdNext[2]);
+    ASSERT_TRUE(e.waitPage(3, kStep));
+    answer.answers = {true};
+    // Pulled once records are on their way, from the event loop inside the transfer's wait.
+    QElapsedTimer pulledAt;
+    QTimer puller;
+    QObject::connect(&puller, &QTimer::timeout, [&] {
+        if (!pulledAt.isValid() && e.w().ProgressBar->value() > 0) {
+            sim.pull();
+            pulledAt.start();
+        }
+    });
+    puller.start(10);
+    e.click(e.w().CmdNext[3]);
+    ASSERT_TRUE(e.waitPage(0, 60000));
+    ASSERT_TRUE(pulledAt.isValid());
+    EXPECT_LE(pulledAt.elapsed(), 21000);  // within the record's own give-up, 21 s
+    EXPECT_EQ(answer.texts,
+              (std::vector<std::string>{"OK to start the download?", "Download failed."}));
+    EXPECT_FALSE(e.program->port.portOpen());
+    EXPECT_EQ(e.program->port.settings(), "9600,n,8,1");
+}
+
 // Closing the window while the program waits for the instrument ends the process at once:
 // long before the identification's 84 s of time-outs would have returned.
 TEST(E2e_WizardDeathTest, ClosingWhileWaitingEndsTheProcess) {

@@ -3,6 +3,7 @@
 #include <string>
 #include <vector>
 
+#include "app/identity.h"
 #include "download/commands.h"
 
 namespace {
@@ -23,6 +24,7 @@ Commands:
                         identify, check the file and send it to the instrument.
                         Exit status 0 only when the instrument confirmed the new revision.
   --help                show this text.
+  --version             show the version.
 )";
 
 }  // namespace
@@ -32,6 +34,10 @@ int main(int argc, char** argv) {
     if (args.empty() || args[0] == "--help" || args[0] == "-h" || args[0] == "help") {
         std::cout << kUsage;
         return args.empty() ? 2 : 0;
+    }
+    if (args[0] == "--version") {
+        std::cout << "zx917-download " << zx917::kVersion << "\n";
+        return 0;
     }
     const std::string command = args[0];
     args.erase(args.begin());

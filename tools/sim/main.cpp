@@ -14,6 +14,7 @@
 #include <string>
 #include <thread>
 
+#include "app/identity.h"
 #include "instrument/instrument.h"
 #include "sim/expect.h"
 
@@ -47,6 +48,8 @@ The ZX917 instrument on a pseudo-terminal.
   --expect FILE          compare every record received with this download file
   --report PATH          write the JSON report there at the end (else stdout)
   --once                 end after "REBOOT" has been answered or the line hung up
+  --help                 show this text
+  --version              show the version
 )";
 
 struct Pending {
@@ -155,8 +158,11 @@ int main(int argc, char** argv) {
             reportPath = next();
         else if (a == "--once")
             once = true;
-        else if (a == "--help") {
+        else if (a == "--help" || a == "-h") {
             std::cout << kUsage;
+            return 0;
+        } else if (a == "--version") {
+            std::cout << "zx917-sim " << zx917::kVersion << "\n";
             return 0;
         } else {
             std::cerr << "zx917-sim: unknown option " << a << "\n" << kUsage;
