@@ -7,6 +7,7 @@
 set -euo pipefail
 zx917_root="$(cd "$(dirname "$0")/.." && pwd)"
 source "$zx917_root/tools/deps.sh"
+zx917_packages+=("${zx917_package_tools[@]}")
 ensure_deps
 mode="${1:-}"
 [ "${CI:-}" = "true" ] && [ -z "$mode" ] && mode="--all"

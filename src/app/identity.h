@@ -13,6 +13,8 @@ inline constexpr const char* kExeBaseName = "ZX917A";
 inline constexpr const char* kHexFolderName = "HEX";
 inline constexpr const char* kHelpFileSuffix = ".HLP";
 inline constexpr const char* kClipFileName = "Filemove.avi";
+// One application id for the desktop entry, the AppStream component and the icon.
+inline constexpr const char* kAppId = "com.quorvex.zx917a";
 
 // The folder that holds the running executable (no trailing separator but at the root).
 std::string ProgramFolder();

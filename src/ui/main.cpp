@@ -51,7 +51,7 @@ Arguments parse(int argc, char** argv) {
         std::cout << usage.toStdString();
         out.exitNow = 0;
     } else if (parser.isSet(version)) {
-        std::cout << "ZX917A " << zx917::kVersion << "\n";
+        std::cout << name.toStdString() << " " << zx917::kVersion << "\n";
         out.exitNow = 0;
     }
     out.options.traceFile = parser.value(trace).toStdString();
@@ -71,6 +71,7 @@ int main(int argc, char** argv) {
     QApplication::setApplicationName("ZX917A");
     QApplication::setApplicationVersion(zx917::kVersion);
     QApplication::setWindowIcon(zx917::ui::ProgramIcon());
+    QGuiApplication::setDesktopFileName(zx917::kAppId);
     zx917::ui::Program program(arguments.options);
     program.Main();
     return QApplication::exec();
