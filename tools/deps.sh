@@ -1,7 +1,7 @@
 # Installs the Debian packages the project needs, only when one is missing.
 # fonts-liberation2 is metric-compatible with Arial, the windows' design font.
 zx917_packages=(cmake g++ ninja-build pkg-config qt6-base-dev qt6-serialport-dev
-    qt6-svg-dev libgtest-dev libgmock-dev socat time python3 clang libclang-rt-14-dev fonts-liberation2)
+    qt6-svg-dev libsqlite3-dev libgtest-dev libgmock-dev socat time python3 clang libclang-rt-14-dev fonts-liberation2)
 
 # What the package and its checks need (tools/package.sh, the package test).
 zx917_package_tools=(dpkg-dev help2man lintian desktop-file-utils appstream)

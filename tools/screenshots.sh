@@ -41,7 +41,7 @@ pids+=($!)
 export DISPLAY="$display"
 for _ in $(seq 50); do xdpyinfo >/dev/null 2>&1 && [ -e "$work/COM1" ] && break; sleep 0.1; done
 cd "$work"
-XDG_RUNTIME_DIR="$work" ZX917_COM1="$work/COM1" "$work/ZX917A" >/dev/null 2>&1 &
+ZX917_HISTORY="$work/history.sqlite" XDG_RUNTIME_DIR="$work" ZX917_COM1="$work/COM1" "$work/ZX917A" >/dev/null 2>&1 &
 pids+=($!)
 
 window() {  # the id of the window with this exact title

@@ -38,6 +38,12 @@ void TerminalDialogs::critical(const std::string& text) {
 
 bool TerminalDialogs::question(const std::string& text) {
     last_ = text;
+    const bool ok = ask(text);
+    declined_ = declined_ || !ok;
+    return ok;
+}
+
+bool TerminalDialogs::ask(const std::string& text) {
     std::cerr << TerminalLines(text);
     if (assumeYes_) {
         std::cerr << " [OK]" << std::endl;

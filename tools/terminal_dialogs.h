@@ -17,11 +17,16 @@ public:
     void beep() override;
 
     int criticalCount() const { return criticals_; }
+    // A question was answered with Cancel: the engineer stopped.
+    bool declined() const { return declined_; }
     const std::string& lastMessage() const { return last_; }
 
 private:
+    bool ask(const std::string& text);
+
     bool assumeYes_;
     int criticals_ = 0;
+    bool declined_ = false;
     std::string last_;
 };
 

@@ -30,6 +30,8 @@ void Engine::RunStage(int16_t stage, int16_t step, const std::function<void()>& 
 }
 
 void Engine::RunCurrentStep(const std::function<void()>& onTurn) {
+    log_.abortedByInstrument = false;
+    log_.portLost = false;
     SendStep();
     WaitForRunEnd(onTurn);
 }
@@ -51,6 +53,11 @@ void Engine::FailRun(const std::string& why) {
     forgetRun();
 }
 
+void Engine::failPort(const std::string& why) {
+    log_.portLost = true;
+    FailRun(why);
+}
+
 void Engine::forgetRun() {
     // A switch left pending would move the next run's first command to the download speed.
     app_.SpeedSwitchPending = 0;
@@ -60,7 +67,7 @@ void Engine::forgetRun() {
 void Engine::MSComm1_OnComm() {
     app_.WaitTicks = 0;  // any event ends a wait in progress
     if (port_.commEvent() == kCommEvFailed) {
-        if (running()) FailRun("serial port failed: " + port_.errorText());
+        if (running()) failPort("serial port failed: " + port_.errorText());
         return;
     }
     dsrBranch();

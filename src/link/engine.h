@@ -17,6 +17,17 @@ namespace zx917 {
 inline constexpr const char* kDownloadSettings = "38400,E,8,1";
 inline constexpr int16_t kDownloadHandshaking = 3;
 
+// What the line showed of the runs, for the service record of a download.
+struct LineLog {
+    std::string identity;           // the last identity answer accepted, as received
+    std::string confirmedRevision;  // the revision named by the last answer to "REVC"
+    int32_t recordsSent = 0;        // records put on the line (again after a restart), not resends
+    int32_t resends = 0;
+    int32_t restarts = 0;              // restarts of a memory area granted
+    bool abortedByInstrument = false;  // the last run: the instrument's request ended it
+    bool portLost = false;             // the last run: the port failed under it
+};
+
 struct EngineParts {
     AppState& app;
     const CommandScript& script;
@@ -65,6 +76,7 @@ public:
     void CheckAbortRestart();
 
     bool running() const { return app_.ScriptStep < kNoRun; }
+    LineLog& lineLog() { return log_; }
 
 private:
     const ScriptEntry& entry(int16_t stage, int16_t step) const;
@@ -80,6 +92,8 @@ private:
     void receiveBranch();
     void dsrBranch();
     void abortRun(const std::string& why);
+    // Ends the run because the port failed under it.
+    void failPort(const std::string& why);
     // Every way a run ends: nothing of it may act on the next run.
     void forgetRun();
     void keepFlippedParity();
@@ -101,6 +115,7 @@ private:
     // when the line has not been flipped in this run.
     std::string flippedSettings_;
     std::function<void(const std::string&)> trace_;
+    LineLog log_;
 };
 
 }  // namespace zx917

@@ -113,6 +113,7 @@ bool Engine::CheckIdnAnswer() {
     const std::string& l = app_.LineBuffer;
     if (l.size() != 46) return false;
     app_.CurrentRevision = std::string_view(l).substr(46 - 7);
+    log_.identity = l;
     return true;
 }
 
@@ -126,6 +127,7 @@ bool Engine::CheckRevAnswer() {
 
 bool Engine::CheckNewRevision() {
     const std::string& l = app_.LineBuffer;
+    if (l.size() >= 11) log_.confirmedRevision = l.substr(4, 7);
     return l.size() == 14 && l.compare(4, 7, app_.NewRevision.str()) == 0;
 }
 

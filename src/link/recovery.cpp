@@ -22,6 +22,7 @@ void Engine::Retry_Timer() {
                  std::to_string(app_.MaxResends) + ": " + current().Command);
         }
         resending_ = true;
+        ++log_.resends;
         SendStep();
         resending_ = false;
         app_.ElapsedTicks = 0;
@@ -73,6 +74,7 @@ void Engine::CheckAbortRestart() {
 
 void Engine::abortRun(const std::string& why) {
     note(why);
+    log_.abortedByInstrument = true;
     app_.StepResult = false;
     retry_.setEnabled(false);
     app_.ScriptStep = kNoRun;
@@ -83,6 +85,7 @@ void Engine::abortRun(const std::string& why) {
 
 void Engine::restartArea(const std::string& request) {
     note("restart granted: " + request);
+    ++log_.restarts;
     app_.LineBuffer.clear();
     // A peer that holds the line stopped keeps the queue full: the run's own give-up (or an
     // abort) must still end the drain, and then the run's end decides.
@@ -90,7 +93,7 @@ void Engine::restartArea(const std::string& request) {
     if (!running()) return;
     port_.clearOutBuffer();
     if (!port_.output(app_.Terminator + request + app_.Terminator)) {
-        FailRun("could not echo the restart: " + port_.errorText());
+        failPort("could not echo the restart: " + port_.errorText());
         return;
     }
     app_.LastCommand.clear();

@@ -80,11 +80,14 @@ bool Engine::sendCommand(const ScriptEntry& e, bool first) {
     // Records are armed at their first send only, so that the resend limit holds for them.
     if (c == "DLS" || c == "DL") {
         if (first) arm(2, c == "DLS" ? 40 : 5);
-        return sendBytes(app_.RecordBytes);
+        const bool sent = sendBytes(app_.RecordBytes);
+        if (sent && first) ++log_.recordsSent;
+        return sent;
     }
     if (c == "DLE") {
         if (first) arm(2, lastRecordTimeout(stage));
         const bool sent = sendBytes(app_.RecordBytes);
+        if (sent && first) ++log_.recordsSent;
         if (sent) timer1_.setEnabled(true);
         return sent;
     }
@@ -104,13 +107,13 @@ bool Engine::sendCommand(const ScriptEntry& e, bool first) {
 
 bool Engine::sendText(const std::string& text) {
     if (port_.output(text)) return true;
-    FailRun("could not send: " + port_.errorText());
+    failPort("could not send: " + port_.errorText());
     return false;
 }
 
 bool Engine::sendBytes(const std::vector<uint8_t>& bytes) {
     if (port_.output(std::span<const uint8_t>(bytes))) return true;
-    FailRun("could not send: " + port_.errorText());
+    failPort("could not send: " + port_.errorText());
     return false;
 }
 
@@ -135,7 +138,7 @@ bool Engine::reopenForResend() {
     bool ok = port_.setSettings(s);
     ok = port_.setHandshaking(app_.PortHandshaking) && ok;
     ok = port_.setPortOpen(true) && ok;
-    if (!ok) FailRun("could not reopen the port: " + port_.errorText());
+    if (!ok) failPort("could not reopen the port: " + port_.errorText());
     return ok;
 }
 
@@ -166,7 +169,7 @@ void Engine::sendBranch() {
     ok = port_.setHandshaking(kDownloadHandshaking) && ok;
     ok = port_.setPortOpen(true) && ok;
     app_.SpeedSwitchPending = 0;
-    if (!ok) FailRun("could not switch speed: " + port_.errorText());
+    if (!ok) failPort("could not switch speed: " + port_.errorText());
 }
 
 }  // namespace zx917

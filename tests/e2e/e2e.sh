@@ -11,6 +11,7 @@ cleanup() {
     rm -rf "$work"
 }
 trap cleanup EXIT
+export ZX917_HISTORY="$work/history.sqlite"  # downloads of the tests stay out of the user's record
 fail() { echo "FAIL ($scenario): $*" >&2; exit 1; }
 
 start_sim() {

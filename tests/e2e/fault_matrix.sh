@@ -14,6 +14,7 @@ cleanup() {
     rm -rf "$work"
 }
 trap cleanup EXIT
+export ZX917_HISTORY="$work/history.sqlite"  # downloads of the tests stay out of the user's record
 export ZX917_TICK_MS=20
 
 "$bin/zx917-mkfile" --bytes 8000 "$work/NEW.HEX" >/dev/null

@@ -10,6 +10,15 @@
 
 namespace zx917::test {
 
+// A download file of our records with this revision in its header.
+inline gen::Bytes DownloadFile(const std::string& revision, int records = 3) {
+    gen::FileLayout layout;
+    layout.header = revision + "\r\nMDSP:" + revision + "\r\nCDMA:" + revision +
+                    "\r\nAMPS:" + revision + "\r\nMPU:" + revision + "\r\n";
+    layout.sections = gen::StandardSections(records);
+    return gen::Build(layout);
+}
+
 struct FirmwareRig {
     explicit FirmwareRig(InstrumentOptions options = {}, bool withInstrument = true)
         : world(std::move(options), withInstrument),

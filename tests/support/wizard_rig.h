@@ -11,19 +11,11 @@
 #include "common/download_files.h"
 #include "link/port_defaults.h"
 #include "support/fake_dialogs.h"
+#include "support/firmware_rig.h"
 #include "support/sim_world.h"
 #include "ui/wizard/frm_main.h"
 
 namespace zx917::test {
-
-// A download file of our records with this revision in its header.
-inline gen::Bytes DownloadFile(const std::string& revision, int records = 3) {
-    gen::FileLayout layout;
-    layout.header = revision + "\r\nMDSP:" + revision + "\r\nCDMA:" + revision +
-                    "\r\nAMPS:" + revision + "\r\nMPU:" + revision + "\r\n";
-    layout.sections = gen::StandardSections(records);
-    return gen::Build(layout);
-}
 
 // A file with a download file's shape whose header tags are wrong: "This is not the download file."
 inline std::string NotADownloadFile() {

@@ -7,6 +7,8 @@
 
 #include <QRegularExpression>
 
+#include "history/service_record.h"
+#include "history/sha256.h"
 #include "ui_e2e/e2e_support.h"
 
 namespace zx917 {
@@ -29,6 +31,7 @@ struct E2e {
         ui::ProgramOptions o;
         o.programFolder = folder.dir.path();
         o.traceFile = folder.dir.path() + "/trace.txt";
+        o.historyPath = folder.dir.path() + "/history.sqlite";
         o.tickMs = tickMs;
         program = std::make_unique<ui::Program>(o);
         program->endProcess = [this] { ++ended; };
@@ -146,6 +149,36 @@ TEST(E2e_Wizard, WholeDownloadByClicksAndKeys) {
     ASSERT_TRUE(test::waitFor([&] { return e.ended == 1; }, kStep));
     EXPECT_EQ(answer.texts.back(), "OK to exit the download program?");
     EXPECT_FALSE(e.program->port.portOpen());
+
+    // The service record holds the wizard's download; one by the command line joins it.
+    const std::string record = e.folder.dir.path() + "/history.sqlite";
+    std::filesystem::create_directory(dir.path() + "/cli");
+    SimProcess cliSim(dir.path() + "/cli", {"--revision", "A.01.02"});
+    ASSERT_TRUE(cliSim.ready());
+    QProcess cli;
+    QProcessEnvironment env = QProcessEnvironment::systemEnvironment();
+    env.insert("ZX917_HISTORY", QString::fromStdString(record));
+    cli.setProcessEnvironment(env);
+    cli.start(QString::fromStdString(test::kBuildDir + "/tools/zx917-download"),
+              {"download", "--port", QString::fromStdString(cliSim.link()), "--file",
+               QString::fromStdString(file), "--yes"});
+    ASSERT_TRUE(cli.waitForFinished(kStep));
+    EXPECT_EQ(cli.exitCode(), 0) << cli.readAllStandardError().toStdString();
+    std::string error;
+    const auto rows = ServiceRecord::Read(record, {}, error);
+    ASSERT_TRUE(rows && rows->size() == 2) << error;
+    const std::string sha = Sha256OfFile(file).value_or("?");
+    for (const Attempt& a : *rows) {
+        EXPECT_EQ(a.outcome, "success");
+        EXPECT_EQ(a.identity, "Quorvex,ZX917,SN0001234567,FW----------A.01.02");
+        EXPECT_EQ(a.revisionBefore, "A.01.02");
+        EXPECT_EQ(a.revisionAnnounced, "A.02.00");
+        EXPECT_EQ(a.revisionConfirmed, "A.02.00");
+        EXPECT_EQ(a.fileSha256, sha);
+    }
+    EXPECT_EQ((*rows)[1].frontEnd, "wizard");
+    EXPECT_EQ((*rows)[1].filePath, e.folder.dir.path() + "/HEX/new.hex");
+    EXPECT_EQ((*rows)[0].frontEnd, "command line");
 }
 
 TEST(E2e_Wizard, AbortMidTransferEndsOnPageZero) {

@@ -23,6 +23,15 @@ Commands:
   download --port DEV --file FILE [same options] [--yes]
                         identify, check the file and send it to the instrument.
                         Exit status 0 only when the instrument confirmed the new revision.
+                        Every attempt is kept in the service record.
+  history [--limit N | --all] [--instrument TEXT] [--since DATE] [--json | --csv]
+                        the service record of every download, by the wizard and by this
+                        command, newest first (20 unless --limit or --all): when, which
+                        instrument, from which revision to which, which file (SHA-256), and
+                        the outcome. --instrument keeps the attempts whose identity holds
+                        TEXT, --since those started on or after DATE (2026-12-01, UTC).
+                        The record is $ZX917_HISTORY, else
+                        $XDG_DATA_HOME/zx917/history.sqlite (~/.local/share/zx917/...).
   --help                show this text.
   --version             show the version.
 )";
@@ -50,6 +59,7 @@ int main(int argc, char** argv) {
     if (command == "check") return zx917::RunCheckCommand(args);
     if (command == "identify") return zx917::RunIdentifyCommand(args);
     if (command == "download") return zx917::RunDownloadCommand(args);
+    if (command == "history") return zx917::RunHistoryCommand(args);
     std::cerr << "zx917-download: unknown command '" << command << "'\n" << kUsage;
     return 2;
 }

@@ -16,6 +16,7 @@
 #include "firmware/download_file.h"
 #include "firmware/operations.h"
 #include "firmware/revision.h"
+#include "history/download_recorder.h"
 #include "link/command_script.h"
 #include "link/engine.h"
 #include "link/line_settings.h"
@@ -201,16 +202,36 @@ int RunDownloadCommand(const std::vector<std::string>& args) {
     qtCore();
     Session s(o);
     AppState& app = s.app;
+    // The service record: this attempt from now on; a record that cannot be written is said
+    // once and changes nothing else.
+    DownloadRecorder record(
+        {.app = app,
+         .engine = s.engine,
+         .frontEnd = "command line",
+         .historyPath = {},
+         .traceFile = o.trace.empty() ? "" : std::filesystem::absolute(o.trace).string(),
+         .portDevice = [&o] { return o.port; },
+         .warn =
+             [](const std::string& why) {
+                 std::cerr << "zx917-download: warning: " << why << std::endl;
+             }});
+    record.begin();
+    // Every way out: the instrument's confirmation, the engineer's Cancel, or a failure.
+    auto finish = [&](bool confirmed) {
+        record.end(!confirmed && s.dialogs.declined() ? kOutcomeCancelled
+                                                      : OutcomeOf(confirmed, s.engine.lineLog()));
+        return confirmed ? 0 : 1;
+    };
     if (!s.identify()) {
         s.putPortBack();
-        return 1;
+        return finish(false);
     }
     printRevision(s);
     // The file chooser's check, with the hardware question, and what "&Open" keeps.
     const std::filesystem::path path = std::filesystem::absolute(o.file);
     if (!CheckDownloadFile({app, s.file, s.dialogs, s.texts}, path.string(), 1)) {
         s.putPortBack();
-        return 1;
+        return finish(false);
     }
     app.FilePath = path.string();
     app.SelectedFileName = path.filename().string();
@@ -221,21 +242,22 @@ int RunDownloadCommand(const std::vector<std::string>& args) {
     if (CurrentIsNewerOrEqual(app.CurrentRevision, app.SelectedRevision) &&
         !s.dialogs.question(s.texts.MessageTable[kMsgCurrentIsNewer])) {
         s.putPortBack();
-        return 1;
+        return finish(false);
     }
     if (!s.ops.PrepareDownload()) {
         s.putPortBack();
-        return 1;
+        return finish(false);
     }
     std::cout << "download time: " << s.view.estimate << std::endl;
     if (!s.dialogs.question(s.texts.QuestionTable[kQstStart])) {
         s.putPortBack();
-        return 1;
+        return finish(false);
     }
+    record.update();  // what a transfer cut short leaves behind
     const bool ok = s.ops.StartDownload();
     if (ok) std::cout << "Download successfully completed." << std::endl;
     s.close();
-    return ok ? 0 : 1;
+    return finish(ok);
 }
 
 }  // namespace zx917

@@ -159,7 +159,7 @@ bool Instrument::applyFault(Fault* f, int64_t now) {
 }
 
 std::string Instrument::identity() const {
-    std::string id = "Quorvex,ZX917,SN0001234567,FW";
+    std::string id = opt_.identity;
     id.resize(39, '-');
     return id + revision_;
 }

@@ -36,6 +36,9 @@ bool ParseFault(const std::string& text, Fault& fault);
 
 struct InstrumentOptions {
     std::string revision = "A.01.02";
+    // The identity answer's first 39 characters (maker, model, serial number); the revision
+    // follows. Cut or padded with "-".
+    std::string identity = "Quorvex,ZX917,SN0001234567,FW";
     char ampsFlag = '1';
     LineSettings userLine;            // 9600,n,8,1
     std::string terminator = "\r\n";  // the line end the engineer set up on both sides

@@ -27,6 +27,8 @@ constexpr const char* kUsage = R"(usage: zx917-sim [OPTIONS]
 The ZX917 instrument on a pseudo-terminal.
   --link PATH            put a symlink to the terminal at PATH (the program opens PATH)
   --revision REV         current firmware revision (A.01.02)
+  --identity TEXT        the identity answer's first 39 characters, the revision follows
+                         (Quorvex,ZX917,SN0001234567,FW)
   --settings S           the instrument's own serial settings (9600,n,8,1)
   --terminator crlf|cr|lf  line end of its queries (crlf)
   --amps-flag C          flag in its REV answers; 0 leaves the AMPS section out (1)
@@ -115,6 +117,8 @@ int main(int argc, char** argv) {
             link = next();
         else if (a == "--revision")
             opt.revision = next();
+        else if (a == "--identity")
+            opt.identity = next();
         else if (a == "--settings") {
             auto s = zx917::ParseLineSettings(next());
             if (!s) {

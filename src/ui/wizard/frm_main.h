@@ -22,6 +22,7 @@
 #include "app/texts.h"
 #include "firmware/download_view.h"
 #include "firmware/operations.h"
+#include "history/download_recorder.h"
 #include "link/command_script.h"
 #include "link/engine.h"
 #include "ui/common/enter_clicks.h"
@@ -54,6 +55,8 @@ struct WizardParts {
     // Shows the file chooser modally and returns when the engineer has left it; the chooser
     // FrmNewSel when empty.
     std::function<void()> showFileChooser;
+    // The service record of each download started with Execute; none when empty.
+    DownloadRecorder* recorder = nullptr;
 };
 
 class FrmMain : public QWidget, public DownloadView {

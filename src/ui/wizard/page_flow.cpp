@@ -94,11 +94,14 @@ void FrmMain::CmdNext_Click(int16_t index) {
             GoToPage(3);
             ops_.PrepareDownload();
             break;
-        case 3:
+        case 3: {
             if (!p_.dialogs.question(p_.texts.QuestionTable[kQstStart])) break;
+            if (p_.recorder) p_.recorder->begin();
             GoToPage(4);
-            ops_.StartDownload();
+            const bool confirmed = ops_.StartDownload();
+            if (p_.recorder) p_.recorder->end(OutcomeOf(confirmed, p_.engine.lineLog()));
             break;
+        }
         case 5:
             p_.dialogs.information(p_.texts.QuestionTable[kQstExit]);
             close();
@@ -152,6 +155,8 @@ void FrmMain::closeEvent(QCloseEvent* event) {
 // The one way the program ends, whatever closed the window and wherever the program waits:
 // the port is closed and the process ends without unwinding the waits.
 void FrmMain::Form_Unload() {
+    // Closed in the middle of a transfer: the engineer stopped it.
+    if (p_.recorder && p_.recorder->inProgress()) p_.recorder->end(kOutcomeCancelled);
     if (p_.port.portOpen()) p_.port.setPortOpen(false);
     help_.close();
     if (p_.endProcess) p_.endProcess();

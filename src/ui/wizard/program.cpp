@@ -4,6 +4,7 @@
 
 #include <QStandardPaths>
 #include <cstdio>
+#include <filesystem>
 
 #include "app/identity.h"
 #include "app/startup.h"
@@ -32,6 +33,18 @@ Program::Program(const ProgramOptions& o)
         trace = std::make_unique<TraceWriter>(o.traceFile);
         AttachTrace(*trace, port, engine);
     }
+    // The wizard's texts are fixed: a record that cannot be written is said in the trace only.
+    recorder = std::make_unique<DownloadRecorder>(RecorderParts{
+        .app = app,
+        .engine = engine,
+        .frontEnd = "wizard",
+        .historyPath = o.historyPath,
+        .traceFile = o.traceFile.empty() ? "" : std::filesystem::absolute(o.traceFile).string(),
+        .portDevice = [this] { return QtSerialPort::DevicePath(port.commPort()); },
+        .warn =
+            [this](const std::string& why) {
+                if (trace) trace->event(why);
+            }});
     endProcess = [this] {
         if (trace) trace->flush();
         std::fflush(nullptr);
@@ -50,7 +63,8 @@ Program::Program(const ProgramOptions& o)
                       .drawnFamily = {},
                       .describePort = DescribeComPort,
                       .endProcess = [this] { endProcess(); },
-                      .showFileChooser = {}};
+                      .showFileChooser = {},
+                      .recorder = recorder.get()};
     window = std::make_unique<FrmMain>(parts);
     dialogs.setOwner(window.get());
 }

@@ -10,6 +10,7 @@
 #include "app/app_state.h"
 #include "app/file_slot.h"
 #include "app/texts.h"
+#include "history/download_recorder.h"
 #include "link/command_script.h"
 #include "link/engine.h"
 #include "link/qt/qt_platform.h"
@@ -25,8 +26,9 @@ struct ProgramOptions {
     // Where the download folder goes when the program's folder is not the user's to write:
     // the application's data folder (~/.local/share/ZX917A) when empty.
     std::string userDataFolder;
-    std::string traceFile;  // support trace of the line; none when empty
-    int tickMs = 1000;      // the 1000 ms tick; only tests shorten it
+    std::string traceFile;    // support trace of the line; none when empty
+    std::string historyPath;  // the service record; DefaultHistoryPath() when empty
+    int tickMs = 1000;        // the 1000 ms tick; only tests shorten it
 };
 
 class Program {
@@ -55,6 +57,7 @@ public:
     Engine engine;
     QtDialogs dialogs;
     std::unique_ptr<TraceWriter> trace;
+    std::unique_ptr<DownloadRecorder> recorder;
     std::unique_ptr<FrmMain> window;
 };
 
