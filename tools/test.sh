@@ -3,7 +3,7 @@
 #   tools/test.sh              the normal build and its tests
 #   tools/test.sh --sanitize   the whole suite built with AddressSanitizer and UBSan
 #   tools/test.sh --all        the sanitized suite without the windows, each fuzz target for
-#                              30 s, then the normal suite (CI runs this when CI=true)
+#                              20 s, then the normal suite (CI runs this when CI=true)
 set -euo pipefail
 zx917_root="$(cd "$(dirname "$0")/.." && pwd)"
 source "$zx917_root/tools/deps.sh"
@@ -42,7 +42,7 @@ case "$mode" in
     ;;
 --all)
     sanitized quick
-    bash "$zx917_root/tests/fuzz/run_fuzz.sh" 30
+    bash "$zx917_root/tests/fuzz/run_fuzz.sh" 20
     run_suite "$zx917_root/build"  # last, so that its summary closes the run
     ;;
 *)

@@ -94,7 +94,14 @@ TEST(QtSerialPort_Dsr, EngineRecoveryThroughTheRealAdapter) {
     port.readModemLines = lines.reader();
     QtTimer retry(kRetryIntervalMs), rsRetry(kRsRetryIntervalMs), timer1(kTimer1IntervalMs);
     QtEventPump pump;
-    Engine engine(EngineParts{app, script, port, retry, rsRetry, timer1, pump, file});
+    Engine engine(EngineParts{.app = app,
+                              .script = script,
+                              .port = port,
+                              .retry = retry,
+                              .rsRetry = rsRetry,
+                              .timer1 = timer1,
+                              .pump = pump,
+                              .file = file});
     ASSERT_TRUE(port.setPortOpen(true));
     ASSERT_TRUE(port.setSettings("38400,E,8,1"));
 

@@ -22,8 +22,14 @@ inline gen::Bytes DownloadFile(const std::string& revision, int records = 3) {
 struct FirmwareRig {
     explicit FirmwareRig(InstrumentOptions options = {}, bool withInstrument = true)
         : world(std::move(options), withInstrument),
-          ops(FirmwareParts{world.app, texts, dialogs, world.file, world.engine, world.port,
-                            world.timer1, view}) {
+          ops(FirmwareParts{.app = world.app,
+                            .texts = texts,
+                            .dialogs = dialogs,
+                            .file = world.file,
+                            .engine = world.engine,
+                            .port = world.port,
+                            .timer1 = world.timer1,
+                            .view = view}) {
         InitMessages(texts);
     }
 

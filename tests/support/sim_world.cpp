@@ -131,7 +131,14 @@ void SimSerialPort::raise(int16_t code) {
 SimWorld::SimWorld(InstrumentOptions options, bool withInstrument)
     : instrument(withInstrument ? std::make_unique<Instrument>(std::move(options)) : nullptr),
       port(clock, instrument.get()),
-      engine(EngineParts{app, script, port, retry, rsRetry, timer1, pump, file}) {
+      engine(EngineParts{.app = app,
+                         .script = script,
+                         .port = port,
+                         .retry = retry,
+                         .rsRetry = rsRetry,
+                         .timer1 = timer1,
+                         .pump = pump,
+                         .file = file}) {
     InitDefaults(app, "/opt/zx917");
     InitCommandScript(script);
     port.setSettings(app.PortSettings);

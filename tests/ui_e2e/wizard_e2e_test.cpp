@@ -257,6 +257,42 @@ TEST(E2e_Wizard, PulledAdapterMidTransferEndsOnPageZero) {
     EXPECT_EQ(e.program->port.settings(), "9600,n,8,1");
 }
 
+// The window closed during the transfer ends the program there (the test only counts the end):
+// the service record says the engineer stopped it.
+TEST(E2e_Wizard, ClosedMidTransferRecordedAsCancelled) {
+    gen::TempDir dir;
+    ModalAnswerer answer;
+    const std::string file = test::MakeDownloadFile(dir.path() + "/NEW.HEX", "A.02.00");
+    SimProcess sim(dir.path(), {"--expect", QString::fromStdString(file), "--line-rate"});
+    ASSERT_TRUE(sim.ready());
+    ::setenv("ZX917_COM1", sim.link().c_str(), 1);
+    E2e e(20);  // 20 ms ticks: the transfer left running after the close gives up at once
+    e.click(e.w().CmdNext[0]);
+    ASSERT_TRUE(e.waitPage(1, kStep));
+    e.click(e.w().CmdNext[1]);
+    ASSERT_TRUE(e.waitPage(2, kStep));
+    e.program->app.FilePath = file;
+    e.program->app.SelectedFileName = "NEW.HEX";
+    e.program->app.SelectedRevision = "A.02.00";
+    e.w().CmdNext[2]->setEnabled(true);
+    e.click(e.w().CmdNext[2]);
+    ASSERT_TRUE(e.waitPage(3, kStep));
+    answer.answers = {true};
+    QTimer closer;  // from the event loop, inside the transfer's wait
+    QObject::connect(&closer, &QTimer::timeout, [&] {
+        if (e.ended == 0 && e.w().ProgressBar->value() > 0) e.w().close();
+    });
+    closer.start(10);
+    e.click(e.w().CmdNext[3]);
+    ASSERT_TRUE(test::waitFor([&] { return e.ended == 1 && e.w().currentPage() == 0; }, kStep));
+    std::string error;
+    const auto rows = ServiceRecord::Read(e.folder.dir.path() + "/history.sqlite", {}, error);
+    ASSERT_TRUE(rows && rows->size() == 1) << error;
+    EXPECT_EQ(rows->front().outcome, "cancelled");
+    EXPECT_EQ(rows->front().frontEnd, "wizard");
+    EXPECT_GT(rows->front().recordsSent, 0);
+}
+
 // Closing the window while the program waits for the instrument ends the process at once:
 // long before the identification's 84 s of time-outs would have returned.
 TEST(E2e_WizardDeathTest, ClosingWhileWaitingEndsTheProcess) {

@@ -81,9 +81,23 @@ class Session {
 public:
     explicit Session(const Options& o)
         : opt_(o),
-          engine(EngineParts{app, script, port, retry, rsRetry, timer1, pump, file}),
+          engine(EngineParts{.app = app,
+                             .script = script,
+                             .port = port,
+                             .retry = retry,
+                             .rsRetry = rsRetry,
+                             .timer1 = timer1,
+                             .pump = pump,
+                             .file = file}),
           dialogs(o.yes),
-          ops(FirmwareParts{app, texts, dialogs, file, engine, port, timer1, view}) {
+          ops(FirmwareParts{.app = app,
+                            .texts = texts,
+                            .dialogs = dialogs,
+                            .file = file,
+                            .engine = engine,
+                            .port = port,
+                            .timer1 = timer1,
+                            .view = view}) {
         InitMessages(texts);
         InitCommandScript(script);
         InitDefaults(app, ProgramFolder());

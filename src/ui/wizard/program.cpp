@@ -28,7 +28,14 @@ Program::Program(const ProgramOptions& o)
       retry(scaled(kRetryIntervalMs, o.tickMs)),
       rsRetry(scaled(kRsRetryIntervalMs, o.tickMs)),
       timer1(scaled(kTimer1IntervalMs, o.tickMs)),
-      engine(EngineParts{app, script, port, retry, rsRetry, timer1, pump, file}) {
+      engine(EngineParts{.app = app,
+                         .script = script,
+                         .port = port,
+                         .retry = retry,
+                         .rsRetry = rsRetry,
+                         .timer1 = timer1,
+                         .pump = pump,
+                         .file = file}) {
     if (!o.traceFile.empty()) {
         trace = std::make_unique<TraceWriter>(o.traceFile);
         AttachTrace(*trace, port, engine);
