@@ -45,6 +45,19 @@ struct E2e {
     bool waitPage(int page, int ms) {
         return test::waitFor([&] { return w().currentPage() == page; }, ms);
     }
+    // Identified, the file chosen as "&Open" leaves it (A.02.00), page 3 shown.
+    bool toPage3(const std::string& file) {
+        click(w().CmdNext[0]);
+        if (!waitPage(1, kStep)) return false;
+        click(w().CmdNext[1]);
+        if (!waitPage(2, kStep)) return false;
+        program->app.FilePath = file;
+        program->app.SelectedFileName = "NEW.HEX";
+        program->app.SelectedRevision = "A.02.00";
+        w().CmdNext[2]->setEnabled(true);
+        click(w().CmdNext[2]);
+        return waitPage(3, kStep);
+    }
 
     ProgramFolder folder;
     std::unique_ptr<ui::Program> program;
@@ -190,16 +203,7 @@ TEST(E2e_Wizard, AbortMidTransferEndsOnPageZero) {
     ASSERT_TRUE(sim.ready());
     ::setenv("ZX917_COM1", sim.link().c_str(), 1);
     E2e e;
-    e.click(e.w().CmdNext[0]);
-    ASSERT_TRUE(e.waitPage(1, kStep));
-    e.click(e.w().CmdNext[1]);
-    ASSERT_TRUE(e.waitPage(2, kStep));
-    e.program->app.FilePath = file;
-    e.program->app.SelectedFileName = "NEW.HEX";
-    e.program->app.SelectedRevision = "A.02.00";
-    e.w().CmdNext[2]->setEnabled(true);
-    e.click(e.w().CmdNext[2]);
-    ASSERT_TRUE(e.waitPage(3, kStep));
+    ASSERT_TRUE(e.toPage3(file));
     answer.answers = {true};
     bool transferShown = false;  // the click waits inside: watch from the event loop
     QTimer watch;
@@ -226,16 +230,7 @@ TEST(E2e_Wizard, PulledAdapterMidTransferEndsOnPageZero) {
     ASSERT_TRUE(sim.ready());
     ::setenv("ZX917_COM1", sim.link().c_str(), 1);
     E2e e;
-    e.click(e.w().CmdNext[0]);
-    ASSERT_TRUE(e.waitPage(1, kStep));
-    e.click(e.w().CmdNext[1]);
-    ASSERT_TRUE(e.waitPage(2, kStep));
-    e.program->app.FilePath = file;
-    e.program->app.SelectedFileName = "NEW.HEX";
-    e.program->app.SelectedRevision = "A.02.00";
-    e.w().CmdNext[2]->setEnabled(true);
-    e.click(e.w().CmdNext[2]);
-    ASSERT_TRUE(e.waitPage(3, kStep));
+    ASSERT_TRUE(e.toPage3(file));
     answer.answers = {true};
     // Pulled once records are on their way, from the event loop inside the transfer's wait.
     QElapsedTimer pulledAt;
@@ -267,16 +262,7 @@ TEST(E2e_Wizard, ClosedMidTransferRecordedAsCancelled) {
     ASSERT_TRUE(sim.ready());
     ::setenv("ZX917_COM1", sim.link().c_str(), 1);
     E2e e(20);  // 20 ms ticks: the transfer left running after the close gives up at once
-    e.click(e.w().CmdNext[0]);
-    ASSERT_TRUE(e.waitPage(1, kStep));
-    e.click(e.w().CmdNext[1]);
-    ASSERT_TRUE(e.waitPage(2, kStep));
-    e.program->app.FilePath = file;
-    e.program->app.SelectedFileName = "NEW.HEX";
-    e.program->app.SelectedRevision = "A.02.00";
-    e.w().CmdNext[2]->setEnabled(true);
-    e.click(e.w().CmdNext[2]);
-    ASSERT_TRUE(e.waitPage(3, kStep));
+    ASSERT_TRUE(e.toPage3(file));
     answer.answers = {true};
     QTimer closer;  // from the event loop, inside the transfer's wait
     QObject::connect(&closer, &QTimer::timeout, [&] {
