@@ -60,6 +60,10 @@ TEST(Chooser_Open, OnlyTheFileTheLastCheckAccepted) {
              drives->setCurrentIndex(drives->count() - 1);
              emit drives->activated(drives->count() - 1);
              EXPECT_EQ(r.chooser->dirlist->path(), other);
+             // That drive picked again is no change either.
+             r.type(r.chooser->FileName, "x");
+             emit drives->activated(drives->count() - 1);
+             EXPECT_EQ(r.chooser->FileName->text(), "X");
          },
          false},
     };

@@ -232,6 +232,7 @@ void FrmNewSel::drvlist_Change() {
     FileName->clear();
     FirmRev2->clear();
     const std::string root = drvlist->currentData().toByteArray().toStdString();
+    shownDrive_ = root;
     if (!dirlist->setPath(root)) {
         couldNotRead();
         showDriveOf(dirlist->path());
